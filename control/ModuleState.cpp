@@ -1,0 +1,10 @@
+#include "control/ModuleState.h"
+
+namespace dovrel {
+
+ModuleState& ModuleState::ofThisThread() {
+    thread_local ModuleState state;
+    return state;
+}
+
+} // namespace dovrel

@@ -1,0 +1,50 @@
+#pragma once
+
+#include "platform/Controls.h"
+#include "platform/Grid.h"
+#include "platform/Variant.h"
+
+#include <cstdint>
+#include <string>
+
+namespace dovrel {
+
+// The part of the control that the document reader fills and moves: the
+// record position and search, the header boxes, the search boxes it reads,
+// the lines grid and the progress bar. The control is made of this and more.
+class DocumentView {
+public:
+    DocumentView();
+    virtual ~DocumentView() = default;
+    DocumentView(const DocumentView&) = delete;
+    DocumentView& operator=(const DocumentView&) = delete;
+
+    // Resets the lines grid: the heading row and one empty row, eight
+    // columns, every column right-aligned.
+    void InitDocLines();
+
+    int32_t PubACTLocation = 2;
+    int32_t PubPrevLocation = 0;
+    std::string PubSearchBy;
+    Variant PubSearchValue = Variant(std::string());
+
+    TextBox txtAccountKey{"txtAccountKey"};
+    TextBox txtReference1{"txtReference1"};
+    TextBox txtCustomerName{"txtCustomerName"};
+    TextBox txtDate{"txtDate"};
+    TextBox txtAddress1{"txtAddress1"};
+    TextBox txtAddress2{"txtAddress2"};
+    TextBox txtTotalVat{"txtTotalVat"};
+    TextBox txtVatValue{"txtVatValue"};
+    TextBox txtTotal1{"txtTotal1"};
+
+    TextBox txtItemKey{"txtItemKey"};
+    TextBox txtDetails{"txtDetails"};
+    TextBox txtFromDate{"txtFromDate", "01/01/1980"};
+
+    Grid DocLines{"DocLines"};
+    Shape ProgressFrame{"ProgressFrame", 3720, 4680, 3015, 495};
+    Shape ProgressFill{"ProgressFill", 3720, 4680, 0, 495};
+};
+
+} // namespace dovrel

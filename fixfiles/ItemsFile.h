@@ -1,0 +1,22 @@
+#pragma once
+
+#include "fixfiles/CurrentDocument.h"
+#include "fixfiles/ProgressBar.h"
+
+#include <string>
+
+namespace dovrel {
+
+constexpr size_t kItmRecordLength = 500;
+
+// Gives the lines of the current document their items' category codes and
+// foreign names from CompPath\ITM.fix. True when the whole file was read;
+// a missing or unreadable file raises an error.
+bool ReadITM(const std::string& CompPath, CurrentDocument& doc, ProgressBar progress);
+
+// The last record ReadITM and ReadACT read: (length / record length) - 1,
+// rounded to the nearest whole number, halves to even. Records 2 up to it are
+// read; record 1 and the file's last record are not.
+int64_t LastScanRecord(int64_t fileLength, size_t recordLength);
+
+} // namespace dovrel

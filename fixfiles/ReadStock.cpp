@@ -1,0 +1,1 @@
+#include "fixfiles/ReadStock.h"

@@ -1,0 +1,46 @@
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <string>
+#include <vector>
+
+namespace dovrel {
+
+// A file of fixed-length records numbered from 1, opened read-only for one
+// operation and closed with the object. Records are read with pread in large
+// blocks, forward or backward, so a scan costs a few system calls per block
+// and its memory does not grow with the file. The file may change while it is
+// read: a record that is no longer (or not yet) wholly in the file is simply
+// not there.
+class RecordFile {
+public:
+    // Opens the file (a file-system path); an error when it cannot be opened.
+    RecordFile(const std::string& path, size_t recordLength, size_t blockSize = 256 * 1024);
+    ~RecordFile();
+    RecordFile(const RecordFile&) = delete;
+    RecordFile& operator=(const RecordFile&) = delete;
+
+    // The file length in bytes when it was opened.
+    int64_t length() const { return length_; }
+    size_t recordLength() const { return recordLength_; }
+    const std::string& path() const { return path_; }
+
+    // Record n, or nullptr when the file does not hold all of it. A record
+    // number below 1 is an error ("Bad record number"). The pointer stays
+    // valid until the next call.
+    const unsigned char* record(int64_t n);
+
+private:
+    void fill(int64_t offset);
+
+    std::string path_;
+    int fd_ = -1;
+    size_t recordLength_;
+    int64_t length_ = 0;
+    std::vector<unsigned char> block_;
+    int64_t blockStart_ = 0;  // file offset of block_[0]
+    size_t blockBytes_ = 0;   // bytes of block_ that hold file data
+};
+
+} // namespace dovrel

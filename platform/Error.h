@@ -1,0 +1,20 @@
+#pragma once
+
+#include <stdexcept>
+#include <string>
+
+namespace dovrel {
+
+// A run-time error of the system: it ends the current routine and travels to
+// the caller, which either reports it (the long file and database work) or
+// lets it reach the host. The description is UTF-8 text meant for a person.
+class Error : public std::runtime_error {
+public:
+    explicit Error(const std::string& description) : std::runtime_error(description) {}
+};
+
+// The description of errno after a failed system call on a file, as
+// "<what> <path>: <reason>".
+[[noreturn]] void ThrowSystemError(const std::string& what, const std::string& path, int err);
+
+} // namespace dovrel
