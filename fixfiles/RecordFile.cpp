@@ -1,1 +1,91 @@
 #include "fixfiles/RecordFile.h"
+
+#include "platform/Error.h"
+
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <limits>
+
+namespace dovrel {
+
+RecordFile::RecordFile(const std::string& path, size_t recordLength, size_t blockSize)
+    : path_(path), recordLength_(recordLength),
+      block_(std::max(blockSize, recordLength)) {
+    // O_NONBLOCK keeps a named pipe planted where a data file should be from
+    // hanging the open; such a file is then refused below.
+    fd_ = ::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY);
+    if (fd_ < 0)
+        ThrowSystemError("Cannot open", path, errno);
+    struct stat st;
+    if (::fstat(fd_, &st) != 0) {
+        int err = errno;
+        ::close(fd_);
+        ThrowSystemError("Cannot read", path, err);
+    }
+    if (!S_ISREG(st.st_mode)) {
+        ::close(fd_);
+        throw Error("Cannot read " + path + ": not a regular file");
+    }
+    length_ = st.st_size;
+}
+
+RecordFile::~RecordFile() {
+    if (fd_ >= 0)
+        ::close(fd_);
+}
+
+const unsigned char* RecordFile::record(int64_t n) {
+    if (n < 1)
+        throw Error("Bad record number " + std::to_string(n) + " in " + path_);
+    auto len = static_cast<int64_t>(recordLength_);
+    if (n - 1 > (std::numeric_limits<int64_t>::max() - len) / len)
+        return nullptr;
+    int64_t offset = (n - 1) * len;
+    auto inBlock = [&] {
+        return offset >= blockStart_ &&
+               offset + len <= blockStart_ + static_cast<int64_t>(blockBytes_);
+    };
+    if (!inBlock()) {
+        // A record past the end the last read met is not there; asking the
+        // file again for each one would make a walk over a shortened file slow.
+        if (endSeen_ >= 0 && offset + len > endSeen_)
+            return nullptr;
+        fill(offset);
+        if (!inBlock())
+            return nullptr;
+    }
+    return block_.data() + (offset - blockStart_);
+}
+
+// Reads a block that holds the record at offset: starting at it when the scan
+// goes forward, ending with it when the scan has moved backward.
+void RecordFile::fill(int64_t offset) {
+    auto size = static_cast<int64_t>(block_.size());
+    int64_t start = offset;
+    if (blockBytes_ > 0 && offset < blockStart_)
+        start = std::max<int64_t>(0, offset + static_cast<int64_t>(recordLength_) - size);
+    blockStart_ = start;
+    blockBytes_ = 0;
+    while (blockBytes_ < block_.size()) {
+        ssize_t got = ::pread(fd_, block_.data() + blockBytes_, block_.size() - blockBytes_,
+                              start + static_cast<int64_t>(blockBytes_));
+        if (got < 0 && errno == EINTR)
+            continue;
+        if (got < 0)
+            ThrowSystemError("Cannot read", path_, errno);
+        if (got == 0)
+            break;
+        blockBytes_ += static_cast<size_t>(got);
+    }
+    int64_t end = blockStart_ + static_cast<int64_t>(blockBytes_);
+    if (blockBytes_ < block_.size())
+        endSeen_ = end;
+    else if (end > endSeen_)
+        endSeen_ = -1;
+}
+
+} // namespace dovrel

@@ -41,6 +41,7 @@ private:
     std::vector<unsigned char> block_;
     int64_t blockStart_ = 0;  // file offset of block_[0]
     size_t blockBytes_ = 0;   // bytes of block_ that hold file data
+    int64_t endSeen_ = -1;    // where the last read met the end of the file; -1 unknown
 };
 
 } // namespace dovrel
