@@ -3,7 +3,6 @@
 #include "platform/Error.h"
 
 #include <cstdio>
-#include <cstdlib>
 
 namespace dovrel {
 
@@ -98,13 +97,19 @@ int64_t FullYear(int year) {
 
 } // namespace
 
-int Date::year() const { return CivilFromSerial(serial).year; }
-int Date::month() const { return CivilFromSerial(serial).month; }
-int Date::day() const { return CivilFromSerial(serial).day; }
+int Date::year() const {
+    return CivilFromSerial(serial).year;
+}
+int Date::month() const {
+    return CivilFromSerial(serial).month;
+}
+int Date::day() const {
+    return CivilFromSerial(serial).day;
+}
 
 Date DateSerial(int64_t year, int64_t month, int64_t day) {
-    if (std::llabs(year) > kPartLimit || std::llabs(month) > kPartLimit ||
-        std::llabs(day) > kPartLimit) {
+    auto outOfReach = [](int64_t part) { return part < -kPartLimit || part > kPartLimit; };
+    if (outOfReach(year) || outOfReach(month) || outOfReach(day)) {
         throw Error("Invalid date");
     }
     int64_t monthIndex = month - 1;

@@ -3,32 +3,26 @@
 #include "platform/Error.h"
 
 #include <cmath>
-#include <cstdint>
 #include <cstdio>
 
 namespace dovrel {
 
 namespace {
 
-// Above this the cents of a double are no longer exact and there is no tie
-// worth detecting.
-constexpr double kTieCheckLimit = 1e15;
-
-// True when |value| * 100 lies exactly halfway between two whole cents.
-bool IsExactHalfCent(double magnitude, double& lowerCents) {
-    lowerCents = std::floor(magnitude * 100.0);
-    return std::fma(magnitude, 100.0, -(lowerCents + 0.5)) == 0.0;
-}
-
 // The digits of the magnitude with two decimals: integer digits, then the two
 // decimal digits, without a separator.
 std::string CentsDigits(double magnitude) {
     char buffer[400];
-    double lowerCents = 0;
-    if (magnitude < kTieCheckLimit && IsExactHalfCent(magnitude, lowerCents)) {
-        auto cents = static_cast<int64_t>(lowerCents) + 1;
-        std::snprintf(buffer, sizeof buffer, "%lld%02lld", static_cast<long long>(cents / 100),
-                      static_cast<long long>(cents % 100));
+    // The tie test runs on the fractional part alone: it is exact (below 1,
+    // so fraction * 100 and its half cents are exact too), which a test on
+    // magnitude * 100 stops being once that passes 2^52.
+    double whole = std::floor(magnitude);
+    double fraction = magnitude - whole;
+    double lowerCents = std::floor(fraction * 100.0);
+    if (std::fma(fraction, 100.0, -(lowerCents + 0.5)) == 0.0) {
+        // Only .125, .375, .625 and .875 are exact halves, so rounding up never
+        // carries into the whole part.
+        std::snprintf(buffer, sizeof buffer, "%.0f%02d", whole, static_cast<int>(lowerCents) + 1);
         return buffer;
     }
     int length = std::snprintf(buffer, sizeof buffer, "%.2f", magnitude);

@@ -14,13 +14,17 @@ constexpr unsigned char kDosAlef = 0x80;
 constexpr unsigned char kDosTav = 0x9A;
 constexpr unsigned char kWindowsOffset = 0x60;
 
-bool IsDosHebrew(unsigned char c) { return c >= kDosAlef && c <= kDosTav; }
+bool IsDosHebrew(unsigned char c) {
+    return c >= kDosAlef && c <= kDosTav;
+}
 
 bool IsLatinOrDigit(unsigned char c) {
     return (c >= '0' && c <= '9') || (c >= 'A' && c <= 'Z') || (c >= 'a' && c <= 'z');
 }
 
-char ToWindowsHebrew(unsigned char c) { return static_cast<char>(c + kWindowsOffset); }
+char ToWindowsHebrew(unsigned char c) {
+    return static_cast<char>(c + kWindowsOffset);
+}
 
 unsigned char FoldCase(char c) {
     auto u = static_cast<unsigned char>(c);
@@ -120,7 +124,9 @@ std::string_view Trim(std::string_view text) {
     return text.substr(first, last - first + 1);
 }
 
-std::string TrimCopy(std::string_view text) { return std::string(Trim(text)); }
+std::string TrimCopy(std::string_view text) {
+    return std::string(Trim(text));
+}
 
 bool EqualsNoCase(std::string_view a, std::string_view b) {
     if (a.size() != b.size()) {
@@ -180,7 +186,12 @@ constexpr int16_t kLastCompanyCurrency = 18;
 
 CurrencyPair CompanyCurrency(int16_t code, const CompanyRecord& company) {
     std::string name = company.currencyName(code - kFirstCompanyCurrency + 1);
+    // A company record that was never read holds code 0 bytes; such a field
+    // is as empty as one of spaces and must not reach a page as control bytes.
     std::string_view trimmed = Trim(name);
+    if (trimmed.find_first_not_of('\0') == std::string_view::npos) {
+        trimmed = {};
+    }
     if (trimmed.empty()) {
         std::string number = std::to_string(code);
         return {number, number};

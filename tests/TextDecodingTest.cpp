@@ -1,0 +1,170 @@
+#include "fixfiles/TextDecoding.h"
+
+#include "TestCompany.h"
+#include "fixfiles/CompanyFile.h"
+
+#include <gtest/gtest.h>
+
+#include <sstream>
+
+namespace dovrel {
+namespace {
+
+using test::W;
+
+// "8D 85 8C 99" -> the four bytes.
+std::string Bytes(std::string_view hex) {
+    std::istringstream in{std::string(hex)};
+    std::string result;
+    unsigned value = 0;
+    while (in >> std::hex >> value) {
+        result.push_back(static_cast<char>(value));
+    }
+    return result;
+}
+
+TEST(LogicalTextTest, ExampleRows) {
+    EXPECT_EQ(LogicalText(Bytes("8D 85 8C 99")), Bytes("F9 EC E5 ED"));
+    EXPECT_EQ(LogicalText(Bytes("8D 8C 85 92 20 8D 85 8C 99")),
+              Bytes("F9 EC E5 ED 20 F2 E5 EC ED"));
+    EXPECT_EQ(LogicalText(Bytes("41 42 43")), Bytes("41 42 43 20"));
+    EXPECT_EQ(LogicalText(Bytes("31 32 33 20 8F 85 81 99 87")),
+              Bytes("31 32 33 20 E7 F9 E1 E5 EF 20"));
+    EXPECT_EQ(LogicalText(Bytes("28 8D 85 8C 99 29")), Bytes("29 F9 EC E5 ED 28"));
+}
+
+TEST(LogicalTextTest, PlainRunsAndEmptyText) {
+    EXPECT_EQ(LogicalText(""), "");
+    // The padding after a Latin run stays in front of the added space.
+    EXPECT_EQ(LogicalText("A1b2 "), "A1b2  ");
+    // Hebrew letters and spaces only: reversed, letters mapped, padding moves to the front.
+    EXPECT_EQ(LogicalText(Bytes("80 20 9A 20 20")), Bytes("20 20 FA 20 E0"));
+    // Both ends of the Hebrew range; the bytes beside them are neutrals.
+    EXPECT_EQ(LogicalText(Bytes("7F 80 9A 9B")), Bytes("9B FA E0 7F"));
+}
+
+TEST(LogicalTextTest, NeutralsBetweenHebrewAndLatin) {
+    // A neutral inside Hebrew text stays itself while no Latin letter follows it.
+    EXPECT_EQ(LogicalText(Bytes("8D 2E 8C")), Bytes("EC 2E ED"));
+    // With a Latin letter after it in the stored text it becomes a space.
+    EXPECT_EQ(LogicalText(Bytes("8D 2E 8C 41")), Bytes("41 20 EC 20 ED"));
+    // Neutrals before any Hebrew letter keep their place in front.
+    EXPECT_EQ(LogicalText(Bytes("8D 2D 2D")), Bytes("2D 2D ED"));
+    // Only the first Latin run adds a space; later runs join it in front.
+    EXPECT_EQ(LogicalText(Bytes("41 8D 42")), Bytes("41 42 20 ED"));
+}
+
+TEST(LogicalTextTest, CodePage1255TextIsNotReordered) {
+    // Letters already in code page 1255 are neutrals, so a field of them keeps its order.
+    EXPECT_EQ(LogicalText(Bytes("E0 E1 E2")), Bytes("E0 E1 E2"));
+    EXPECT_EQ(LogicalText(Bytes("8D E0")), Bytes("E0 ED"));
+}
+
+TEST(LogicalTextTest, LongFieldsStayWithinInputPlusOne) {
+    std::string allBytes;
+    for (int i = 0; i < 256; ++i) {
+        allBytes.push_back(static_cast<char>(i));
+    }
+    for (const std::string& text :
+         {std::string(1000, '\x85'), std::string(1000, 'z'), std::string(1000, ' '),
+          allBytes + allBytes, std::string(500, 'a') + std::string(500, '\x90')}) {
+        std::string result = LogicalText(text);
+        EXPECT_GE(result.size(), text.size());
+        EXPECT_LE(result.size(), text.size() + 1);
+    }
+    EXPECT_EQ(LogicalText(std::string(300, '\x80')), std::string(300, '\xE0'));
+}
+
+TEST(VisualTextTest, MirrorsBracketsAndMapsLetters) {
+    const std::pair<char, char> mirrors[] = {{'(', ')'}, {')', '('}, {'<', '>'}, {'>', '<'},
+                                             {'[', ']'}, {']', '['}, {'{', '}'}, {'}', '{'}};
+    for (auto [in, out] : mirrors) {
+        EXPECT_EQ(VisualChar(in), out) << in;
+    }
+    EXPECT_EQ(VisualChar('\x80'), '\xE0');
+    EXPECT_EQ(VisualChar('\x9A'), '\xFA');
+    for (char unchanged : {'=', 'a', '/', '\x7F', '\x9B', '\xE0', '\xFF', '\0'}) {
+        EXPECT_EQ(VisualChar(unchanged), unchanged);
+    }
+    EXPECT_EQ(VisualText(""), "");
+    EXPECT_EQ(VisualText(Bytes("28 8D 85 3D 41 29 00")), Bytes("29 ED E5 3D 41 28 00"));
+}
+
+TEST(TrimTest, RemovesSpacesOnly) {
+    EXPECT_EQ(Trim("  ab c  "), "ab c");
+    EXPECT_EQ(Trim("    "), "");
+    EXPECT_EQ(Trim(""), "");
+    EXPECT_EQ(Trim("\tab\t"), "\tab\t");
+    EXPECT_EQ(TrimCopy(std::string(" x\0 ", 4)), std::string("x\0", 2));
+}
+
+TEST(NoCaseTest, FoldsLatinLettersOnly) {
+    EXPECT_TRUE(EqualsNoCase("Next", "NEXT"));
+    EXPECT_TRUE(EqualsNoCase("", ""));
+    EXPECT_FALSE(EqualsNoCase("Next", "Nex"));
+    EXPECT_FALSE(EqualsNoCase("@", "`"));
+    // 0xC0 and 0xE0 differ only in the case bit but are not Latin letters.
+    EXPECT_FALSE(EqualsNoCase("\xC0", "\xE0"));
+    EXPECT_TRUE(EqualsNoCase(W("א-b"), W("א-B")));
+
+    EXPECT_TRUE(ContainsNoCase("Widget Blue", "get b"));
+    EXPECT_TRUE(ContainsNoCase("abc", ""));
+    EXPECT_TRUE(ContainsNoCase("abc", "ABC"));
+    EXPECT_FALSE(ContainsNoCase("ab", "abc"));
+    EXPECT_FALSE(ContainsNoCase("\xE0\xE1", "\xC1"));
+    EXPECT_TRUE(ContainsNoCase(W("שלום Dan"), W("ום d")));
+}
+
+void SetCurrencyName(CompanyRecord& company, int code, std::string_view stored) {
+    std::string field(stored);
+    field.resize(kCurrencyNameWidth, ' ');
+    company.bytes.replace(kCurrencyNamesOffset + (code - 10) * kCurrencyNameWidth,
+                          kCurrencyNameWidth, field);
+}
+
+TEST(CurrencyNamesTest, FixedCodes) {
+    CompanyRecord company;
+    using Pair = std::pair<std::string, std::string>;
+    EXPECT_EQ(CurrencyNames(0, company), Pair());
+    EXPECT_EQ(CurrencyNames(1, company), Pair("$", "$"));
+    EXPECT_EQ(CurrencyNames(2, company), Pair(W("לש"), "\xA3"));
+    EXPECT_EQ(CurrencyNames(3, company), Pair(W("מג"), "DM"));
+    EXPECT_EQ(CurrencyNames(4, company), Pair(W("אר"), "EUR"));
+    EXPECT_EQ(CurrencyNames(5, company), Pair(W("פב"), "BF"));
+    EXPECT_EQ(CurrencyNames(6, company), Pair(W("פש"), "SF"));
+    EXPECT_EQ(CurrencyNames(7, company), Pair(W("פצ"), "FF"));
+    EXPECT_EQ(CurrencyNames(8, company), Pair(W("לא"), "IL"));
+    EXPECT_EQ(CurrencyNames(9, company), Pair(W("ין"), "JY"));
+    EXPECT_EQ(CurrencyNames(19, company), Pair(W("מ"), W("מ")));
+    EXPECT_EQ(CurrencyNames(20, company), Pair(W("מא"), W("מא")));
+    EXPECT_EQ(CurrencyNames(21, company), Pair(W("ש"), "NIS"));
+    EXPECT_EQ(CurrencyNames(22, company), Pair());
+    EXPECT_EQ(CurrencyNames(-1, company), Pair());
+    EXPECT_EQ(CurrencyNames(INT16_MAX, company), Pair());
+    EXPECT_EQ(CurrencyNames(INT16_MIN, company), Pair());
+    EXPECT_EQ(W("לש"), "\xEC\xF9");
+}
+
+TEST(CurrencyNamesTest, CompanyCodesComeFromTheCompanyRecord) {
+    CompanyRecord company;
+    using Pair = std::pair<std::string, std::string>;
+    // A record never read holds code 0 bytes: its names count as empty.
+    EXPECT_EQ(CurrencyNames(11, company), Pair("11", "11"));
+    SetCurrencyName(company, 12, "");
+    EXPECT_EQ(CurrencyNames(12, company), Pair("12", "12"));
+
+    SetCurrencyName(company, 12, Bytes("20 20 8D 85 8C 99"));
+    EXPECT_EQ(CurrencyNames(12, company), Pair(Bytes("F9 EC E5 ED"), Bytes("F9 EC E5 ED")));
+    SetCurrencyName(company, 13, std::string("\0A", 2));
+    EXPECT_EQ(CurrencyNames(13, company).first, std::string("\0A ", 3));
+
+    SetCurrencyName(company, 10, "USD");
+    EXPECT_EQ(CurrencyNames(10, company), Pair("USD ", "USD "));
+    SetCurrencyName(company, 18, std::string(15, 'X'));
+    EXPECT_EQ(CurrencyNames(18, company).first, std::string(15, 'X') + " ");
+    SetCurrencyName(company, 18, "   ");
+    EXPECT_EQ(CurrencyNames(18, company), Pair("18", "18"));
+}
+
+} // namespace
+} // namespace dovrel
