@@ -1,1 +1,188 @@
 #include "app/cli/ShowCommand.h"
+
+#include "app/cli/StateJson.h"
+#include "fixfiles/CompanyFile.h"
+#include "fixfiles/DocTypes.h"
+#include "fixfiles/TextDecoding.h"
+#include "platform/Encoding.h"
+#include "platform/Error.h"
+#include "platform/FileSystem.h"
+#include "platform/Messages.h"
+
+#include <algorithm>
+#include <filesystem>
+#include <ostream>
+#include <utility>
+
+namespace dovrel {
+
+namespace {
+
+using Field = std::pair<std::string, std::string>; // caption, value; UTF-8
+
+const char* const kNoDocument = "לא נמצא מסמך";
+
+std::string Pad(const std::string& text, size_t width) {
+    size_t shown = ShowCommand::DisplayWidth(text);
+    return shown >= width ? text : text + std::string(width - shown, ' ');
+}
+
+std::string TrimRight(std::string text) {
+    text.erase(text.find_last_not_of(' ') + 1);
+    return text;
+}
+
+// Prints "caption: value" lines with the values in one column; a field
+// without a caption continues the one above it.
+void PrintFields(const std::vector<Field>& fields, std::ostream& out) {
+    size_t width = 0;
+    for (const auto& [caption, value] : fields)
+        width = std::max(width, ShowCommand::DisplayWidth(caption) + 1);
+    for (const auto& [caption, value] : fields)
+        out << Pad(caption.empty() ? caption : caption + ":", width) << "  " << value << '\n';
+}
+
+std::string Utf8Trimmed(std::string_view cp1255) {
+    return ToUtf8(TrimCopy(cp1255));
+}
+
+} // namespace
+
+ShowCommand::ShowCommand(ShowOptions options, ModuleState& shared)
+    : options_(std::move(options)), shared_(shared) {}
+
+size_t ShowCommand::DisplayWidth(std::string_view utf8) {
+    return static_cast<size_t>(std::count_if(utf8.begin(), utf8.end(), [](char c) {
+        return (static_cast<unsigned char>(c) & 0xC0) != 0x80;
+    }));
+}
+
+int ShowCommand::run(std::ostream& out, std::ostream& err) {
+    if (options_.start < 1)
+        throw Error("The start record must be 1 or more");
+    compPath_ = FromUtf8(options_.compDir);
+    std::error_code ec;
+    if (!std::filesystem::is_directory(ResolvePath(compPath_), ec))
+        throw Error("Company directory not found: " + options_.compDir);
+    RecordedMessages messages;
+    Card card(messages, shared_);
+    read(card);
+    if (shared_.DocTypes[static_cast<size_t>(row_)].code != options_.type)
+        err << "dovrel: there is no document type " << options_.type << "; showing type "
+            << shared_.DocTypes[static_cast<size_t>(row_)].code << '\n';
+    std::vector<RecordedMessages::Shown> shown = messages.take();
+    if (options_.json)
+        out << StateJson::Dump(StateJson::Build(card), 2) << '\n';
+    for (const auto& message : shown)
+        err << "dovrel: " << ToUtf8(message.title) << ": " << ToUtf8(message.text) << '\n';
+    if (!shown.empty())
+        return 1;
+    if (!options_.json)
+        printDocument(card, out);
+    return 0;
+}
+
+// The same steps as the control's ShowDoc, with the company's own record
+// read first so that its currency names are shown.
+void ShowCommand::read(Card& card) {
+    companyRead_ = ReadAdf(compPath_, shared_.Company);
+    row_ = DocTypeIndex(shared_.DocTypes, options_.type);
+    if (auto* list = dynamic_cast<ComboBox*>(card.findControl("cmbDocType")))
+        if (row_ < list->ListCount())
+            list->setListIndex(row_);
+    shared_.CompDir = compPath_;
+    if (auto* path = dynamic_cast<TextBox*>(card.findControl("txtCompPath")))
+        path->setText(compPath_);
+    card.PubSearchBy.clear();
+    card.PubSearchValue = Variant(std::string());
+    card.PubPrevLocation = 0;
+    card.PubACTLocation = options_.start - 1;
+    std::string direction = "Next";
+    std::string fromDate = card.txtFromDate.Text();
+    card.ReadStock(compPath_, row_, card.PubSearchBy, card.PubSearchValue, direction, fromDate);
+}
+
+void ShowCommand::printDocument(Card& card, std::ostream& out) const {
+    // The reader marks the document it accepts; nothing found is not an error.
+    if (card.PubPrevLocation == 0) {
+        out << kNoDocument << '\n';
+        return;
+    }
+    printHeader(card, out);
+    out << '\n';
+    printLines(card.DocLines, out);
+    out << '\n';
+    printTotals(card, out);
+    printRemarks(out);
+}
+
+void ShowCommand::printHeader(Card& card, std::ostream& out) const {
+    if (companyRead_) {
+        std::string title = LogicalText(shared_.Company.title());
+        std::replace(title.begin(), title.end(), '\0', ' ');
+        if (!Trim(title).empty())
+            out << Utf8Trimmed(title) << "\n\n";
+    }
+    const DocTypeRow& type = shared_.DocTypes[static_cast<size_t>(row_)];
+    std::vector<Field> fields = {
+        {"סוג מסמך", ToUtf8(type.hebrewTitle) + " (" + std::to_string(type.code) + ")"},
+        {"אסמכתא", ToUtf8(card.txtReference1.Text())},
+        {"תאריך", ToUtf8(card.txtDate.Text())},
+        {"כרטיס", ToUtf8(card.txtAccountKey.Text())},
+        {"שם", ToUtf8(card.txtCustomerName.Text())},
+        {"כתובת", ToUtf8(card.txtAddress1.Text())}};
+    if (!card.txtAddress2.Text().empty())
+        fields.push_back({"", ToUtf8(card.txtAddress2.Text())});
+    PrintFields(fields, out);
+}
+
+void ShowCommand::printLines(const Grid& grid, std::ostream& out) const {
+    std::vector<std::vector<std::string>> table;
+    for (int32_t row = 0; row < grid.Rows(); ++row) {
+        std::vector<std::string> cells;
+        bool empty = true;
+        for (int32_t col = 0; col < grid.Cols(); ++col) {
+            cells.push_back(Utf8Trimmed(grid.TextMatrix(row, col)));
+            empty = empty && cells.back().empty();
+        }
+        if (row == 0 || !empty)
+            table.push_back(std::move(cells));
+    }
+    std::vector<size_t> widths(static_cast<size_t>(std::max(grid.Cols(), 0)), 0);
+    for (const auto& cells : table)
+        for (size_t col = 0; col < cells.size(); ++col)
+            widths[col] = std::max(widths[col], DisplayWidth(cells[col]));
+    for (size_t row = 0; row < table.size(); ++row) {
+        std::string line;
+        for (size_t col = 0; col < widths.size(); ++col)
+            line += Pad(table[row][col], widths[col]) + "  ";
+        out << TrimRight(line) << '\n';
+        if (row == 0) {
+            std::string rule;
+            for (size_t width : widths)
+                rule += std::string(width, '-') + "  ";
+            out << TrimRight(rule) << '\n';
+        }
+    }
+}
+
+void ShowCommand::printTotals(Card& card, std::ostream& out) const {
+    PrintFields({{"סה\"כ", ToUtf8(card.txtTotalVat.Text())},
+                 {"מע\"מ", ToUtf8(card.txtVatValue.Text())},
+                 {"סה\"כ כולל מע\"מ", ToUtf8(card.txtTotal1.Text())}},
+                out);
+}
+
+void ShowCommand::printRemarks(std::ostream& out) const {
+    std::vector<std::string> remarks;
+    for (const std::string& remark : shared_.Doc.header.remarksLogical)
+        if (!Trim(remark).empty())
+            remarks.push_back(Utf8Trimmed(remark));
+    if (remarks.empty())
+        return;
+    out << "\nהערות:\n";
+    for (const std::string& remark : remarks)
+        out << "  " << remark << '\n';
+}
+
+} // namespace dovrel

@@ -1,1 +1,50 @@
 #pragma once
+
+#include "control/Card.h"
+#include "control/ModuleState.h"
+
+#include <cstdint>
+#include <iosfwd>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace dovrel {
+
+struct ShowOptions {
+    std::string compDir; // UTF-8, as typed
+    int16_t type = 20;   // document type code
+    int32_t start = 2;   // first record to look at, 1 or more
+    bool json = false;
+};
+
+// `dovrel show`: reads the first document of a type at or after a record, as
+// the control's ShowDoc does, and prints it for a person (UTF-8, reading
+// order) or as the control's state in JSON.
+class ShowCommand {
+public:
+    explicit ShowCommand(ShowOptions options, ModuleState& shared = ModuleState::ofThisThread());
+
+    // Exit code: 0 when the document (or the note that there is none) was
+    // printed, 1 when the reader showed a message box (printed on err).
+    int run(std::ostream& out, std::ostream& err);
+
+    // Display width of UTF-8 text in a terminal: its code points.
+    static size_t DisplayWidth(std::string_view utf8);
+
+private:
+    void read(Card& card);
+    void printDocument(Card& card, std::ostream& out) const;
+    void printHeader(Card& card, std::ostream& out) const;
+    void printLines(const Grid& grid, std::ostream& out) const;
+    void printTotals(Card& card, std::ostream& out) const;
+    void printRemarks(std::ostream& out) const;
+
+    ShowOptions options_;
+    ModuleState& shared_;
+    std::string compPath_;
+    int16_t row_ = 0;
+    bool companyRead_ = false;
+};
+
+} // namespace dovrel

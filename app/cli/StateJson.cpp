@@ -1,1 +1,169 @@
 #include "app/cli/StateJson.h"
+
+#include "platform/Encoding.h"
+
+#include <algorithm>
+#include <cmath>
+
+namespace dovrel {
+
+using nlohmann::json;
+
+json StateJson::Build(const Card& card) {
+    const ModuleState& shared = card.shared();
+    json state;
+    state["PubACTLocation"] = card.PubACTLocation;
+    state["PubPrevLocation"] = card.PubPrevLocation;
+    state["PubSearchBy"] = Text(card.PubSearchBy);
+    state["PubSearchValue"] = FromVariant(card.PubSearchValue);
+    state["CompDir"] = Text(shared.CompDir);
+    state["controls"] = Controls(card);
+    state["grid"] = GridCells(card.DocLines);
+    state["progress"] = {{"frame", card.ProgressFrame.Width()},
+                         {"fill", card.ProgressFill.Width()}};
+    state["doc"] = Document(shared.Doc);
+    state["accounts"] = {{"count", shared.Accounts.AccountCount},
+                         {"loaded", shared.Accounts.AccountsLoaded}};
+    return state;
+}
+
+json StateJson::Controls(const Card& card) {
+    json controls = json::object();
+    for (const Control* control : card.controls()) {
+        ControlKind kind = control->kind();
+        if (kind == ControlKind::TextBox || kind == ControlKind::ComboBox ||
+            kind == ControlKind::CheckBox)
+            controls[control->name()] = ControlValue(*control);
+    }
+    return controls;
+}
+
+json StateJson::ControlValue(const Control& control) {
+    switch (control.kind()) {
+    case ControlKind::TextBox:
+        return Text(static_cast<const TextBox&>(control).Text());
+    case ControlKind::ComboBox:
+        return static_cast<const ComboBox&>(control).ListIndex();
+    case ControlKind::CheckBox:
+        return static_cast<const CheckBox&>(control).Value();
+    case ControlKind::Shape:
+        return static_cast<const Shape&>(control).Width();
+    case ControlKind::Grid:
+        return GridCells(static_cast<const Grid&>(control));
+    case ControlKind::Label:
+    case ControlKind::Button:
+        break;
+    }
+    return nullptr;
+}
+
+json StateJson::GridCells(const Grid& grid) {
+    json rows = json::array();
+    for (int32_t row = 0; row < grid.Rows(); ++row) {
+        json cells = json::array();
+        for (int32_t col = 0; col < grid.Cols(); ++col)
+            cells.push_back(Text(grid.TextMatrix(row, col)));
+        rows.push_back(std::move(cells));
+    }
+    return rows;
+}
+
+json StateJson::Document(const CurrentDocument& doc) {
+    return {{"header", Header(doc.header)},
+            {"lineCount", doc.lineCount},
+            {"lines", Lines(doc)},
+            {"amounts", Amounts(doc)}};
+}
+
+json StateJson::Header(const DocumentHeader& header) {
+    json logical = json::array();
+    json visual = json::array();
+    for (size_t i = 0; i < header.remarksLogical.size(); ++i) {
+        logical.push_back(Text(header.remarksLogical[i]));
+        visual.push_back(Text(header.remarksVisual[i]));
+    }
+    return {{"type", header.type},
+            {"totalBeforeDiscount", Number(header.totalBeforeDiscount)},
+            {"foreignTotal", Number(header.foreignTotal)},
+            {"discountPercent", Number(header.discountPercent)},
+            {"warehouse", header.warehouse},
+            {"customerVisual", Text(header.customerVisual)},
+            {"address1Visual", Text(header.address1Visual)},
+            {"address2Visual", Text(header.address2Visual)},
+            {"remarksLogical", std::move(logical)},
+            {"remarksVisual", std::move(visual)}};
+}
+
+json StateJson::Lines(const CurrentDocument& doc) {
+    json lines = json::array();
+    // The line count comes from a file; never trust it beyond the table.
+    int count = std::clamp<int>(doc.lineCount, 0, kMaxDocLines);
+    for (int i = 1; i <= count; ++i) {
+        const DocumentLine& line = doc.lines[static_cast<size_t>(i)];
+        lines.push_back({{"itemKey", Text(line.itemKey)},
+                         {"catCode", Text(line.catCode)},
+                         {"picFile", Text(line.picFile)},
+                         {"foreignName", Text(line.foreignName)},
+                         {"descriptionVisual", Text(line.descriptionVisual)}});
+    }
+    return lines;
+}
+
+json StateJson::Amounts(const CurrentDocument& doc) {
+    json amounts = json::object();
+    for (int n = 1; n <= kMaxDocLines; ++n) {
+        const LineAmounts& entry = doc.amounts[static_cast<size_t>(n)];
+        if (entry.isZero())
+            continue;
+        amounts[std::to_string(n)] = {{"price", Number(entry.price)},
+                                      {"currency", entry.currency},
+                                      {"quantity", Number(entry.quantity)},
+                                      {"discount", Number(entry.discount)}};
+    }
+    return amounts;
+}
+
+json StateJson::Messages(const std::vector<RecordedMessages::Shown>& shown) {
+    json list = json::array();
+    for (const auto& message : shown) {
+        const char* icon = message.icon == MsgIcon::Critical   ? "critical"
+                           : message.icon == MsgIcon::Question ? "question"
+                                                               : "information";
+        list.push_back({{"icon", icon},
+                        {"title", Text(message.title)},
+                        {"text", Text(message.text)},
+                        {"buttons", message.buttons == MsgButtons::Ok ? "ok" : "yesno"}});
+    }
+    return list;
+}
+
+json StateJson::Text(std::string_view cp1255) {
+    return ToUtf8(cp1255);
+}
+
+json StateJson::Number(double value) {
+    if (!std::isfinite(value))
+        return nullptr;
+    return value;
+}
+
+json StateJson::FromVariant(const Variant& value) {
+    switch (value.kind()) {
+    case Variant::Kind::Text:
+        return Text(value.toText());
+    case Variant::Kind::Number:
+        return Number(value.toNumber());
+    case Variant::Kind::Boolean:
+        return value.toNumber() != 0;
+    case Variant::Kind::Empty:
+    case Variant::Kind::Null:
+        break;
+    }
+    return nullptr;
+}
+
+std::string StateJson::Dump(const json& value, int indent) {
+    return value.dump(indent, ' ', false, json::error_handler_t::replace);
+}
+
+} // namespace dovrel

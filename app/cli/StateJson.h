@@ -1,1 +1,46 @@
 #pragma once
+
+#include "control/Card.h"
+#include "platform/Messages.h"
+#include "platform/Variant.h"
+
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include <nlohmann/json.hpp>
+
+namespace dovrel {
+
+// The control's whole visible state as JSON, for the automation host and
+// `dovrel show --json`. Texts are converted to UTF-8 here; numbers that are
+// not finite (damaged files can hold them) are written as null.
+class StateJson {
+public:
+    static nlohmann::json Build(const Card& card);
+
+    // The value of one control: the text of a text box, the position of a
+    // list, the value of a check box, the width of a shape, the cells of a
+    // grid.
+    static nlohmann::json ControlValue(const Control& control);
+    static nlohmann::json Messages(const std::vector<RecordedMessages::Shown>& shown);
+
+    static nlohmann::json Text(std::string_view cp1255);
+    static nlohmann::json Number(double value);
+    static nlohmann::json FromVariant(const Variant& value);
+
+    // Serialises without failing on bytes that are not UTF-8 (they become
+    // U+FFFD); indent -1 gives one line.
+    static std::string Dump(const nlohmann::json& value, int indent = -1);
+
+private:
+    static nlohmann::json Controls(const Card& card);
+    static nlohmann::json GridCells(const Grid& grid);
+    static nlohmann::json Document(const CurrentDocument& doc);
+    static nlohmann::json Header(const DocumentHeader& header);
+    static nlohmann::json Lines(const CurrentDocument& doc);
+    static nlohmann::json Amounts(const CurrentDocument& doc);
+};
+
+} // namespace dovrel

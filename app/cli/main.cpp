@@ -1,1 +1,59 @@
-int main() { return 0; }
+#include "app/cli/HostSession.h"
+#include "app/cli/ShowCommand.h"
+
+#include <CLI/CLI.hpp>
+
+#include <cstdint>
+#include <functional>
+#include <iostream>
+#include <limits>
+
+namespace {
+
+using Runner = std::function<int()>;
+
+// Each sub-command registers its options and, when chosen, the work to run.
+void AddShow(CLI::App& app, Runner& run) {
+    auto options = std::make_shared<dovrel::ShowOptions>();
+    CLI::App* show = app.add_subcommand("show", "Print one document of a company");
+    show->add_option("COMPDIR", options->compDir, "Company directory")->required();
+    show->add_option("--type", options->type, "Document type code (default 20)")
+        ->check(CLI::Range(0, static_cast<int>(std::numeric_limits<int16_t>::max())));
+    show->add_option("--start", options->start, "First record to look at (default 2)")
+        ->check(CLI::Range(1, std::numeric_limits<int32_t>::max()));
+    show->add_flag("--json", options->json, "Print the control's state as JSON");
+    show->callback([options, &run] {
+        run = [options] { return dovrel::ShowCommand(*options).run(std::cout, std::cerr); };
+    });
+}
+
+void AddHost(CLI::App& app, Runner& run) {
+    CLI::App* host = app.add_subcommand(
+        "host", "Automation: one JSON request per input line, one JSON answer per output line");
+    host->callback(
+        [&run] { run = [] { return dovrel::HostSession().serve(std::cin, std::cout); }; });
+}
+
+} // namespace
+
+int main(int argc, char** argv) {
+    CLI::App app{"dovrel: view the stock documents of a company of the accounting system"};
+    app.require_subcommand(1);
+    Runner run;
+    AddShow(app, run);
+    AddHost(app, run);
+    try {
+        app.parse(argc, argv);
+    } catch (const CLI::ParseError& e) {
+        int code = app.exit(e);
+        return code == 0 ? 0 : 2;
+    }
+    try {
+        return run ? run() : 2;
+    } catch (const std::exception& e) {
+        std::cerr << "dovrel: " << e.what() << '\n';
+    } catch (...) {
+        std::cerr << "dovrel: unknown failure\n";
+    }
+    return 1;
+}

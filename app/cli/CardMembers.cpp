@@ -1,0 +1,79 @@
+#include "app/cli/CardMembers.h"
+
+#include "app/cli/HostArgs.h"
+#include "app/cli/StateJson.h"
+#include "platform/Encoding.h"
+#include "platform/Error.h"
+
+#include <cstdint>
+#include <limits>
+
+namespace dovrel {
+
+namespace {
+
+constexpr int64_t kInt32Min = std::numeric_limits<int32_t>::min();
+constexpr int64_t kInt32Max = std::numeric_limits<int32_t>::max();
+
+} // namespace
+
+void CardMembers::Set(Card& card, const std::string& name, const nlohmann::json& value) {
+    if (!SetPub(card, name, value))
+        SetControl(Find(card, name), value);
+}
+
+bool CardMembers::SetPub(Card& card, const std::string& name, const nlohmann::json& value) {
+    if (name == "PubACTLocation")
+        card.PubACTLocation =
+            static_cast<int32_t>(HostArgs::Integer(value, name, kInt32Min, kInt32Max));
+    else if (name == "PubPrevLocation")
+        card.PubPrevLocation =
+            static_cast<int32_t>(HostArgs::Integer(value, name, kInt32Min, kInt32Max));
+    else if (name == "PubSearchBy")
+        card.PubSearchBy = HostArgs::Text(value, name);
+    else if (name == "PubSearchValue")
+        card.PubSearchValue = HostArgs::Scalar(value, name);
+    else
+        return false;
+    return true;
+}
+
+void CardMembers::SetControl(Control& control, const nlohmann::json& value) {
+    const std::string& name = control.name();
+    switch (control.kind()) {
+    case ControlKind::TextBox:
+        static_cast<TextBox&>(control).setText(HostArgs::Text(value, name));
+        return;
+    case ControlKind::ComboBox:
+        static_cast<ComboBox&>(control).setListIndex(
+            static_cast<int32_t>(HostArgs::Integer(value, name, -1, kInt32Max)));
+        return;
+    case ControlKind::CheckBox:
+        static_cast<CheckBox&>(control).setValue(
+            static_cast<int32_t>(HostArgs::Integer(value, name, 0, 2)));
+        return;
+    default:
+        throw Error(name + " cannot be set");
+    }
+}
+
+nlohmann::json CardMembers::Get(Card& card, const std::string& name) {
+    if (name == "PubACTLocation")
+        return card.PubACTLocation;
+    if (name == "PubPrevLocation")
+        return card.PubPrevLocation;
+    if (name == "PubSearchBy")
+        return StateJson::Text(card.PubSearchBy);
+    if (name == "PubSearchValue")
+        return StateJson::FromVariant(card.PubSearchValue);
+    return StateJson::ControlValue(Find(card, name));
+}
+
+Control& CardMembers::Find(Card& card, const std::string& name) {
+    Control* control = card.findControl(name);
+    if (control == nullptr)
+        throw Error("Unknown member or control: " + name);
+    return *control;
+}
+
+} // namespace dovrel
