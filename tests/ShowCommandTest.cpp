@@ -14,8 +14,10 @@ namespace {
 
 using nlohmann::json;
 using test::TestCompany;
+using ::testing::EndsWith;
 using ::testing::HasSubstr;
 using ::testing::Not;
+using ::testing::StartsWith;
 
 const char* const kCompany = R"({
   "company": {"title": "דמו מחשבים", "currencies": ["יורו"]},
@@ -162,11 +164,18 @@ TEST(ShowCommandTest, JsonIsTheHostsState) {
     EXPECT_EQ(state, hostState);
 }
 
-TEST(ShowCommandTest, DisplayWidthCountsCodePoints) {
-    EXPECT_EQ(ShowCommand::DisplayWidth(""), 0u);
-    EXPECT_EQ(ShowCommand::DisplayWidth("abc"), 3u);
-    EXPECT_EQ(ShowCommand::DisplayWidth("שלום 1"), 6u);
-    EXPECT_EQ(ShowCommand::DisplayWidth("£€"), 2u);
+TEST(ShowCommandTest, ShowsTheScanProgressWhenAsked) {
+    TestCompany company(R"({"documents": [{"file": "ISHP.FIX", "filler": 30},
+        {"type": 20, "customer": "אחרי", "lines": [{"key": "A", "price": 1, "quantity": 1}]}]})");
+    ModuleState shared;
+    std::ostringstream out, err, progress;
+    ShowCommand command({company.path().string(), 20, 2, false}, shared);
+    command.setProgress(&progress);
+    EXPECT_EQ(command.run(out, err), 0);
+    EXPECT_THAT(out.str(), HasSubstr("אחרי"));
+    EXPECT_THAT(progress.str(), StartsWith("\r"));
+    EXPECT_THAT(progress.str(), HasSubstr("%"));
+    EXPECT_THAT(progress.str(), EndsWith("\r     \r"));
 }
 
 } // namespace

@@ -66,6 +66,7 @@ int ShowCommand::run(std::ostream& out, std::ostream& err) {
         throw Error("Company directory not found: " + options_.compDir);
     RecordedMessages messages;
     Card card(messages, shared_);
+    watchProgress(card);
     read(card);
     if (shared_.DocTypes[static_cast<size_t>(row_)].code != options_.type)
         err << "dovrel: there is no document type " << options_.type << "; showing type "
@@ -100,6 +101,19 @@ void ShowCommand::read(Card& card) {
     std::string direction = "Next";
     std::string fromDate = card.txtFromDate.Text();
     card.ReadStock(compPath_, row_, card.PubSearchBy, card.PubSearchValue, direction, fromDate);
+}
+
+void ShowCommand::watchProgress(Card& card) {
+    if (progress_ == nullptr)
+        return;
+    card.ProgressFill.changed.connect([this, &card] {
+        int32_t frame = std::max(card.ProgressFrame.Width(), 1);
+        int32_t percent = std::clamp(card.ProgressFill.Width() * 100 / frame, 0, 100);
+        if (card.ProgressFill.Width() == 0)
+            *progress_ << "\r     \r" << std::flush;
+        else
+            *progress_ << '\r' << percent << '%' << std::flush;
+    });
 }
 
 void ShowCommand::printDocument(Card& card, std::ostream& out) const {

@@ -28,12 +28,15 @@ public:
     // Exit code: 0 when the document (or the note that there is none) was
     // printed, 1 when the reader showed a message box (printed on err).
     int run(std::ostream& out, std::ostream& err);
+    // Shows the progress of the file scan on a terminal ("\r" and a percentage).
+    void setProgress(std::ostream* terminal) { progress_ = terminal; }
 
     // Display width of UTF-8 text in a terminal: its code points.
     static size_t DisplayWidth(std::string_view utf8);
 
 private:
     void read(Card& card);
+    void watchProgress(Card& card);
     void printDocument(Card& card, std::ostream& out) const;
     void printHeader(Card& card, std::ostream& out) const;
     void printLines(const Grid& grid, std::ostream& out) const;
@@ -45,6 +48,7 @@ private:
     std::string compPath_;
     int16_t row_ = 0;
     bool companyRead_ = false;
+    std::ostream* progress_ = nullptr;
 };
 
 } // namespace dovrel

@@ -8,6 +8,8 @@
 #include <iostream>
 #include <limits>
 
+#include <unistd.h>
+
 namespace {
 
 using Runner = std::function<int()>;
@@ -23,7 +25,12 @@ void AddShow(CLI::App& app, Runner& run) {
         ->check(CLI::Range(1, std::numeric_limits<int32_t>::max()));
     show->add_flag("--json", options->json, "Print the control's state as JSON");
     show->callback([options, &run] {
-        run = [options] { return dovrel::ShowCommand(*options).run(std::cout, std::cerr); };
+        run = [options] {
+            dovrel::ShowCommand command(*options);
+            if (isatty(STDERR_FILENO))
+                command.setProgress(&std::cerr);
+            return command.run(std::cout, std::cerr);
+        };
     });
 }
 
