@@ -1,1 +1,80 @@
 #include "fixfiles/ItemsFile.h"
+
+#include "fixfiles/ProgressReset.h"
+#include "fixfiles/RecordFile.h"
+#include "fixfiles/TextDecoding.h"
+#include "platform/FileSystem.h"
+
+#include <algorithm>
+#include <string_view>
+#include <unordered_map>
+
+namespace dovrel {
+
+namespace {
+
+constexpr size_t kItemKeyOffset = 0, kItemKeyWidth = 12;
+constexpr size_t kCategoryOffset = 52, kCategoryWidth = 3;
+constexpr size_t kForeignNameOffset = 85, kForeignNameWidth = 40;
+constexpr int64_t kProgressEvery = 5;
+
+std::string_view Field(const unsigned char* record, size_t offset, size_t width) {
+    return {reinterpret_cast<const char*>(record) + offset, width};
+}
+
+// Keys compare without regard to the case of Latin letters only.
+std::string FoldKey(std::string_view key) {
+    std::string folded(key);
+    for (char& c : folded)
+        if (c >= 'A' && c <= 'Z')
+            c = static_cast<char>(c - 'A' + 'a');
+    return folded;
+}
+
+// Each distinct trimmed item key of the document, to the first entry that holds it.
+std::unordered_map<std::string, int> FirstEntryByKey(const CurrentDocument& doc) {
+    std::unordered_map<std::string, int> index;
+    int count = std::clamp<int>(doc.lineCount, 0, kMaxDocLines);
+    for (int entry = 1; entry <= count; ++entry)
+        index.try_emplace(FoldKey(Trim(doc.lines[entry].itemKey)), entry);
+    return index;
+}
+
+} // namespace
+
+int64_t LastScanRecord(int64_t fileLength, size_t recordLength) {
+    // (length / recordLength) - 1 rounded half to even, in whole numbers so
+    // that no length is too large to be exact.
+    auto n = static_cast<int64_t>(recordLength);
+    if (n <= 0 || fileLength < 0)
+        return -1;
+    int64_t whole = fileLength / n - 1;
+    int64_t twiceRest = 2 * (fileLength % n);
+    if (twiceRest > n || (twiceRest == n && whole % 2 != 0))
+        ++whole;
+    return whole;
+}
+
+bool ReadITM(const std::string& CompPath, CurrentDocument& doc, ProgressBar progress) {
+    RecordFile file(ResolvePath(CompPath + "\\ITM.fix"), kItmRecordLength);
+    int64_t last = LastScanRecord(file.length(), kItmRecordLength);
+    ProgressReset resetter(progress);
+    std::unordered_map<std::string, int> firstEntry = FirstEntryByKey(doc);
+    for (int64_t n = 2; n <= last; ++n) {
+        const unsigned char* record = file.record(n);
+        if (record == nullptr)
+            break; // the file has become shorter; what was read still holds
+        std::string key = FoldKey(Trim(LogicalText(Field(record, kItemKeyOffset, kItemKeyWidth))));
+        auto found = firstEntry.find(key);
+        if (found != firstEntry.end()) {
+            DocumentLine& line = doc.lines[found->second];
+            line.catCode = std::string(Field(record, kCategoryOffset, kCategoryWidth));
+            line.foreignName = TrimCopy(Field(record, kForeignNameOffset, kForeignNameWidth));
+        }
+        if (n % kProgressEvery == 0)
+            progress.show(n, last);
+    }
+    return true;
+}
+
+} // namespace dovrel

@@ -25,9 +25,8 @@ TEST(GridTest, FormatStringMakesColumnsHeadingsAlignmentsAndWidths) {
     EXPECT_EQ(grid.FormatString(), format);
     ASSERT_EQ(grid.Cols(), 7);
     ASSERT_EQ(grid.Rows(), 1);
-    EXPECT_EQ(RowTexts(grid, 0),
-              (std::vector<std::string>{W("שורה"), W("פריט    "), "Mid", "Right  ", "Plain", "",
-                                        ""}));
+    EXPECT_EQ(RowTexts(grid, 0), (std::vector<std::string>{W("שורה"), W("פריט    "), "Mid",
+                                                           "Right  ", "Plain", "", ""}));
     std::vector<int32_t> alignments, widths;
     for (int32_t col = 0; col < grid.Cols(); ++col) {
         alignments.push_back(grid.ColAlignment(col));
