@@ -125,20 +125,6 @@ TEST(GridTest, CellsOutsideTheGridAreErrors) {
     EXPECT_THROW(grid.ColWidthChars(2), Error);
 }
 
-TEST(GridTest, ClearEmptiesEveryCellButKeepsTheShape) {
-    Grid grid("g");
-    grid.setFormatString(">a|>b");
-    grid.AddItem("1\t2");
-    grid.setFixedRows(1);
-    grid.Clear();
-    EXPECT_EQ(grid.Rows(), 2);
-    EXPECT_EQ(grid.Cols(), 2);
-    EXPECT_EQ(grid.FixedRows(), 1);
-    EXPECT_EQ(RowTexts(grid, 0), (std::vector<std::string>{"", ""}));
-    EXPECT_EQ(RowTexts(grid, 1), (std::vector<std::string>{"", ""}));
-    EXPECT_EQ(grid.ColAlignment(1), 7);
-}
-
 TEST(GridTest, CurrentRowAndHeadingRows) {
     Grid grid("ItemPicLines");
     grid.setRows(1);
