@@ -26,8 +26,10 @@ struct AccountsTable {
 };
 
 // Loads every account of CompPath\ACT.fix into the table. True when the whole
-// file was read. A missing or unreadable file raises an error before the
-// table is touched; an error during the scan leaves it partly filled.
+// file was read; a file that becomes shorter during the scan ends it early,
+// still true, with the accounts read so far. A missing or unreadable file
+// raises an error before the table is touched; an error during the scan
+// leaves it partly filled.
 bool ReadACT(const std::string& CompPath, AccountsTable& table, ProgressBar progress);
 
 // A copy of the first entry whose key equals key without regard to letter

@@ -59,6 +59,8 @@ bool ReadITM(const std::string& CompPath, CurrentDocument& doc, ProgressBar prog
     RecordFile file(ResolvePath(CompPath + "\\ITM.fix"), kItmRecordLength);
     int64_t last = LastScanRecord(file.length(), kItmRecordLength);
     ProgressReset resetter(progress);
+    // One lookup per item record. When several records carry the same key,
+    // each writes the same entry again, so the last of them in the file stays.
     std::unordered_map<std::string, int> firstEntry = FirstEntryByKey(doc);
     for (int64_t n = 2; n <= last; ++n) {
         const unsigned char* record = file.record(n);

@@ -11,7 +11,9 @@ constexpr size_t kItmRecordLength = 500;
 
 // Gives the lines of the current document their items' category codes and
 // foreign names from CompPath\ITM.fix. True when the whole file was read;
-// a missing or unreadable file raises an error.
+// a file that becomes shorter during the scan ends it early, still true, with
+// the items read so far applied. A missing or unreadable file raises an error
+// before anything is touched.
 bool ReadITM(const std::string& CompPath, CurrentDocument& doc, ProgressBar progress);
 
 // The last record ReadITM and ReadACT read: (length / record length) - 1,
