@@ -2,6 +2,7 @@
 
 #include "fixfiles/ItemsFile.h"
 #include "fixfiles/ProgressReset.h"
+#include "fixfiles/RecordFields.h"
 #include "fixfiles/RecordFile.h"
 #include "fixfiles/TextDecoding.h"
 #include "platform/Encoding.h"
@@ -19,10 +20,6 @@ constexpr size_t kPhoneOffset = 60, kPhoneWidth = 30;
 constexpr size_t kDistrictOffset = 120, kDistrictWidth = 15;
 constexpr size_t kDetailsOffset = 167, kDetailsWidth = 50;
 constexpr int64_t kProgressEvery = 5;
-
-std::string_view Field(const unsigned char* record, size_t offset, size_t width) {
-    return {reinterpret_cast<const char*>(record) + offset, width};
-}
 
 // A trimmed text field, put into reading order when it holds anything.
 std::string LogicalField(const unsigned char* record, size_t offset, size_t width) {

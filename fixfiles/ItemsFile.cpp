@@ -1,6 +1,7 @@
 #include "fixfiles/ItemsFile.h"
 
 #include "fixfiles/ProgressReset.h"
+#include "fixfiles/RecordFields.h"
 #include "fixfiles/RecordFile.h"
 #include "fixfiles/TextDecoding.h"
 #include "platform/FileSystem.h"
@@ -17,10 +18,6 @@ constexpr size_t kItemKeyOffset = 0, kItemKeyWidth = 12;
 constexpr size_t kCategoryOffset = 52, kCategoryWidth = 3;
 constexpr size_t kForeignNameOffset = 85, kForeignNameWidth = 40;
 constexpr int64_t kProgressEvery = 5;
-
-std::string_view Field(const unsigned char* record, size_t offset, size_t width) {
-    return {reinterpret_cast<const char*>(record) + offset, width};
-}
 
 // Keys compare without regard to the case of Latin letters only.
 std::string FoldKey(std::string_view key) {

@@ -3,6 +3,7 @@
 #include "fixfiles/DateSerial.h"
 #include "fixfiles/Formats.h"
 #include "fixfiles/ProgressBar.h"
+#include "fixfiles/RecordFields.h"
 #include "fixfiles/RecordFile.h"
 #include "fixfiles/TextDecoding.h"
 #include "platform/Encoding.h"
@@ -10,7 +11,6 @@
 #include "platform/FileSystem.h"
 
 #include <array>
-#include <bit>
 #include <cmath>
 #include <cstring>
 #include <limits>
@@ -20,21 +20,6 @@ namespace dovrel {
 namespace {
 
 using Record = std::array<unsigned char, kDocRecordLength>;
-
-std::string_view Field(const unsigned char* rec, size_t offset, size_t width) {
-    return {reinterpret_cast<const char*>(rec) + offset, width};
-}
-
-double DoubleAt(const unsigned char* rec, size_t offset) {
-    uint64_t bits = 0;
-    for (size_t i = 0; i < 8; ++i)
-        bits |= static_cast<uint64_t>(rec[offset + i]) << (8 * i);
-    return std::bit_cast<double>(bits);
-}
-
-int16_t Int16At(const unsigned char* rec, size_t offset) {
-    return static_cast<int16_t>(rec[offset] | (rec[offset + 1] << 8));
-}
 
 double Checked(double value) {
     if (!std::isfinite(value))
