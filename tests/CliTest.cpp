@@ -3,9 +3,10 @@
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
 
+#include <fcntl.h>
+#include <spawn.h>
 #include <sys/wait.h>
 
-#include <cstdlib>
 #include <fstream>
 #include <sstream>
 #include <string>
@@ -15,18 +16,33 @@
 namespace dovrel {
 namespace {
 
-// Runs the built command by the shell; its streams go through files, as a pipe could fill up.
+// Runs the built command without a shell; its streams go through files, as a
+// pipe could fill up.
 auto RunCli(const std::vector<std::string>& args, const std::string& input = "") {
     test::TempDir dir;
-    std::ofstream(dir.path() / "in", std::ios::binary) << input;
-    std::string command = "cd '" + dir.str() + "' && '" DOVREL_CLI "'";
-    for (const std::string& arg : args)
-        command += " '" + arg + "'";
-    int status = std::system((command + " <in >out 2>err").c_str());
-    std::ostringstream out, err;
-    out << std::ifstream(dir.path() / "out", std::ios::binary).rdbuf();
-    err << std::ifstream(dir.path() / "err", std::ios::binary).rdbuf();
-    return std::tuple{WIFEXITED(status) ? WEXITSTATUS(status) : -1, out.str(), err.str()};
+    std::string in = (dir.path() / "in").string(), out = (dir.path() / "out").string(),
+                err = (dir.path() / "err").string();
+    std::ofstream(in, std::ios::binary) << input;
+    posix_spawn_file_actions_t files;
+    posix_spawn_file_actions_init(&files);
+    posix_spawn_file_actions_addopen(&files, 0, in.c_str(), O_RDONLY, 0);
+    posix_spawn_file_actions_addopen(&files, 1, out.c_str(), O_WRONLY | O_CREAT, 0600);
+    posix_spawn_file_actions_addopen(&files, 2, err.c_str(), O_WRONLY | O_CREAT, 0600);
+    std::vector<std::string> words{DOVREL_CLI};
+    words.insert(words.end(), args.begin(), args.end());
+    std::vector<char*> argv;
+    for (std::string& word : words)
+        argv.push_back(word.data());
+    argv.push_back(nullptr);
+    pid_t pid = 0;
+    int status = -1;
+    if (posix_spawn(&pid, DOVREL_CLI, &files, nullptr, argv.data(), environ) == 0)
+        waitpid(pid, &status, 0);
+    posix_spawn_file_actions_destroy(&files);
+    std::ostringstream outText, errText;
+    outText << std::ifstream(out, std::ios::binary).rdbuf();
+    errText << std::ifstream(err, std::ios::binary).rdbuf();
+    return std::tuple{WIFEXITED(status) ? WEXITSTATUS(status) : -1, outText.str(), errText.str()};
 }
 
 TEST(CliTest, ShowPrintsADocumentOfTheDemoCompany) {

@@ -1,5 +1,6 @@
 #include "tools/SampleWriter.h"
 
+#include "fixfiles/TextDecoding.h"
 #include "platform/Encoding.h"
 #include "platform/Error.h"
 
@@ -105,27 +106,12 @@ bool IsRunJoiner(UChar32 c) {
     return c == '.' || c == ',' || c == '-' || c == '/' || c == ':' || c == ' ';
 }
 
+// Brackets turn round when the text is stored in visual order, exactly as
+// the reader turns them back.
 UChar32 Mirrored(UChar32 c) {
-    switch (c) {
-    case '(':
-        return ')';
-    case ')':
-        return '(';
-    case '[':
-        return ']';
-    case ']':
-        return '[';
-    case '{':
-        return '}';
-    case '}':
-        return '{';
-    case '<':
-        return '>';
-    case '>':
-        return '<';
-    default:
+    if (c >= 0x80)
         return c;
-    }
+    return static_cast<unsigned char>(VisualChar(static_cast<char>(c)));
 }
 
 // The DOS byte of one character: Hebrew letters 0x80-0x9A, everything else
