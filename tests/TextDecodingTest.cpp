@@ -11,15 +11,15 @@ namespace dovrel {
 namespace {
 
 using test::W;
+using Pair = std::pair<std::string, std::string>;
 
 // "8D 85 8C 99" -> the four bytes.
 std::string Bytes(std::string_view hex) {
     std::istringstream in{std::string(hex)};
     std::string result;
     unsigned value = 0;
-    while (in >> std::hex >> value) {
+    while (in >> std::hex >> value)
         result.push_back(static_cast<char>(value));
-    }
     return result;
 }
 
@@ -33,7 +33,7 @@ TEST(LogicalTextTest, ExampleRows) {
     EXPECT_EQ(LogicalText(Bytes("28 8D 85 8C 99 29")), Bytes("29 F9 EC E5 ED 28"));
 }
 
-TEST(LogicalTextTest, PlainRunsAndEmptyText) {
+TEST(LogicalTextTest, RunsNeutralsAndPadding) {
     EXPECT_EQ(LogicalText(""), "");
     // The padding after a Latin run stays in front of the added space.
     EXPECT_EQ(LogicalText("A1b2 "), "A1b2  ");
@@ -41,20 +41,15 @@ TEST(LogicalTextTest, PlainRunsAndEmptyText) {
     EXPECT_EQ(LogicalText(Bytes("80 20 9A 20 20")), Bytes("20 20 FA 20 E0"));
     // Both ends of the Hebrew range; the bytes beside them are neutrals.
     EXPECT_EQ(LogicalText(Bytes("7F 80 9A 9B")), Bytes("9B FA E0 7F"));
-}
-
-TEST(LogicalTextTest, NeutralsBetweenHebrewAndLatin) {
-    // A neutral inside Hebrew text stays itself while no Latin letter follows it.
+    // A neutral inside Hebrew text stays itself while no Latin letter follows it,
+    // and becomes a space when one does.
     EXPECT_EQ(LogicalText(Bytes("8D 2E 8C")), Bytes("EC 2E ED"));
-    // With a Latin letter after it in the stored text it becomes a space.
     EXPECT_EQ(LogicalText(Bytes("8D 2E 8C 41")), Bytes("41 20 EC 20 ED"));
-    // Neutrals before any Hebrew letter keep their place in front.
+    // A neutral met (from the end) before any Hebrew letter, or after a Latin one, goes in front.
     EXPECT_EQ(LogicalText(Bytes("8D 2D 2D")), Bytes("2D 2D ED"));
+    EXPECT_EQ(LogicalText(Bytes("2E 41 8D")), Bytes("2E 41 20 ED"));
     // Only the first Latin run adds a space; later runs join it in front.
     EXPECT_EQ(LogicalText(Bytes("41 8D 42")), Bytes("41 42 20 ED"));
-}
-
-TEST(LogicalTextTest, CodePage1255TextIsNotReordered) {
     // Letters already in code page 1255 are neutrals, so a field of them keeps its order.
     EXPECT_EQ(LogicalText(Bytes("E0 E1 E2")), Bytes("E0 E1 E2"));
     EXPECT_EQ(LogicalText(Bytes("8D E0")), Bytes("E0 ED"));
@@ -62,9 +57,8 @@ TEST(LogicalTextTest, CodePage1255TextIsNotReordered) {
 
 TEST(LogicalTextTest, LongFieldsStayWithinInputPlusOne) {
     std::string allBytes;
-    for (int i = 0; i < 256; ++i) {
+    for (int i = 0; i < 256; ++i)
         allBytes.push_back(static_cast<char>(i));
-    }
     for (const std::string& text :
          {std::string(1000, '\x85'), std::string(1000, 'z'), std::string(1000, ' '),
           allBytes + allBytes, std::string(500, 'a') + std::string(500, '\x90')}) {
@@ -75,19 +69,12 @@ TEST(LogicalTextTest, LongFieldsStayWithinInputPlusOne) {
     EXPECT_EQ(LogicalText(std::string(300, '\x80')), std::string(300, '\xE0'));
 }
 
-TEST(VisualTextTest, MirrorsBracketsAndMapsLetters) {
-    const std::pair<char, char> mirrors[] = {{'(', ')'}, {')', '('}, {'<', '>'}, {'>', '<'},
-                                             {'[', ']'}, {']', '['}, {'{', '}'}, {'}', '{'}};
-    for (auto [in, out] : mirrors) {
-        EXPECT_EQ(VisualChar(in), out) << in;
-    }
-    EXPECT_EQ(VisualChar('\x80'), '\xE0');
+TEST(VisualTextTest, KeepsTheStoredOrderMirrorsBracketsAndMapsLetters) {
+    EXPECT_EQ(VisualText("()<>[]{}=a/"), ")(><][}{=a/");
+    EXPECT_EQ(VisualText(Bytes("28 8D 85 3D 41 29 00 80 9A 7F 9B E0 FF")),
+              Bytes("29 ED E5 3D 41 28 00 E0 FA 7F 9B E0 FF"));
     EXPECT_EQ(VisualChar('\x9A'), '\xFA');
-    for (char unchanged : {'=', 'a', '/', '\x7F', '\x9B', '\xE0', '\xFF', '\0'}) {
-        EXPECT_EQ(VisualChar(unchanged), unchanged);
-    }
-    EXPECT_EQ(VisualText(""), "");
-    EXPECT_EQ(VisualText(Bytes("28 8D 85 3D 41 29 00")), Bytes("29 ED E5 3D 41 28 00"));
+    EXPECT_EQ(VisualChar('}'), '{');
 }
 
 TEST(TrimTest, RemovesSpacesOnly) {
@@ -100,7 +87,6 @@ TEST(TrimTest, RemovesSpacesOnly) {
 
 TEST(NoCaseTest, FoldsLatinLettersOnly) {
     EXPECT_TRUE(EqualsNoCase("Next", "NEXT"));
-    EXPECT_TRUE(EqualsNoCase("", ""));
     EXPECT_FALSE(EqualsNoCase("Next", "Nex"));
     EXPECT_FALSE(EqualsNoCase("@", "`"));
     // 0xC0 and 0xE0 differ only in the case bit but are not Latin letters.
@@ -109,10 +95,9 @@ TEST(NoCaseTest, FoldsLatinLettersOnly) {
 
     EXPECT_TRUE(ContainsNoCase("Widget Blue", "get b"));
     EXPECT_TRUE(ContainsNoCase("abc", ""));
-    EXPECT_TRUE(ContainsNoCase("abc", "ABC"));
     EXPECT_FALSE(ContainsNoCase("ab", "abc"));
     EXPECT_FALSE(ContainsNoCase("\xE0\xE1", "\xC1"));
-    EXPECT_TRUE(ContainsNoCase(W("שלום Dan"), W("ום d")));
+    EXPECT_TRUE(ContainsNoCase(W("שלום Dan"), W("ום dAN")));
 }
 
 void SetCurrencyName(CompanyRecord& company, int code, std::string_view stored) {
@@ -122,36 +107,21 @@ void SetCurrencyName(CompanyRecord& company, int code, std::string_view stored) 
                           kCurrencyNameWidth, field);
 }
 
-TEST(CurrencyNamesTest, FixedCodes) {
+TEST(CurrencyNamesTest, FixedCodesAndCodesWithoutNames) {
     CompanyRecord company;
-    using Pair = std::pair<std::string, std::string>;
-    EXPECT_EQ(CurrencyNames(0, company), Pair());
     EXPECT_EQ(CurrencyNames(1, company), Pair("$", "$"));
     EXPECT_EQ(CurrencyNames(2, company), Pair(W("לש"), "\xA3"));
-    EXPECT_EQ(CurrencyNames(3, company), Pair(W("מג"), "DM"));
-    EXPECT_EQ(CurrencyNames(4, company), Pair(W("אר"), "EUR"));
-    EXPECT_EQ(CurrencyNames(5, company), Pair(W("פב"), "BF"));
-    EXPECT_EQ(CurrencyNames(6, company), Pair(W("פש"), "SF"));
-    EXPECT_EQ(CurrencyNames(7, company), Pair(W("פצ"), "FF"));
-    EXPECT_EQ(CurrencyNames(8, company), Pair(W("לא"), "IL"));
     EXPECT_EQ(CurrencyNames(9, company), Pair(W("ין"), "JY"));
     EXPECT_EQ(CurrencyNames(19, company), Pair(W("מ"), W("מ")));
-    EXPECT_EQ(CurrencyNames(20, company), Pair(W("מא"), W("מא")));
     EXPECT_EQ(CurrencyNames(21, company), Pair(W("ש"), "NIS"));
-    EXPECT_EQ(CurrencyNames(22, company), Pair());
-    EXPECT_EQ(CurrencyNames(-1, company), Pair());
-    EXPECT_EQ(CurrencyNames(INT16_MAX, company), Pair());
-    EXPECT_EQ(CurrencyNames(INT16_MIN, company), Pair());
-    EXPECT_EQ(W("לש"), "\xEC\xF9");
+    for (int16_t code : {0, 22, -1, INT16_MAX, INT16_MIN})
+        EXPECT_EQ(CurrencyNames(code, company), Pair()) << code;
 }
 
 TEST(CurrencyNamesTest, CompanyCodesComeFromTheCompanyRecord) {
     CompanyRecord company;
-    using Pair = std::pair<std::string, std::string>;
     // A record never read holds code 0 bytes: its names count as empty.
     EXPECT_EQ(CurrencyNames(11, company), Pair("11", "11"));
-    SetCurrencyName(company, 12, "");
-    EXPECT_EQ(CurrencyNames(12, company), Pair("12", "12"));
 
     SetCurrencyName(company, 12, Bytes("20 20 8D 85 8C 99"));
     EXPECT_EQ(CurrencyNames(12, company), Pair(Bytes("F9 EC E5 ED"), Bytes("F9 EC E5 ED")));
