@@ -16,6 +16,16 @@ constexpr int32_t kAlignGeneral = 9;
 // Far beyond any document or range list; keeps a bad row count from
 // exhausting memory.
 constexpr int32_t kMaxRows = 1000000;
+// The same for the cells: a format string of many columns would otherwise let
+// the row limit alone take gigabytes. Eight columns, as in the lines grid,
+// still reach the row limit.
+constexpr int64_t kMaxCells = int64_t{kMaxRows} * 8;
+
+void CheckCells(const std::string& grid, int64_t rows, int64_t cols) {
+    if (rows * cols > kMaxCells)
+        throw Error("Grid " + grid + ": " + std::to_string(rows) + " rows of " +
+                    std::to_string(cols) + " columns are too many cells");
+}
 
 // Splits text at every separator; n separators give n + 1 parts.
 std::vector<std::string_view> Split(std::string_view text, char separator) {
@@ -54,6 +64,7 @@ int32_t Grid::Rows() const {
 void Grid::setRows(int32_t rows) {
     if (rows < 0 || rows > kMaxRows)
         throw Error("Grid " + name() + ": invalid row count " + std::to_string(rows));
+    CheckCells(name(), rows, cols_);
     cells_.resize(static_cast<size_t>(rows), std::vector<std::string>(static_cast<size_t>(cols_)));
     fixedRows_ = std::min(fixedRows_, rows);
     if (row_ >= rows)
@@ -62,19 +73,21 @@ void Grid::setRows(int32_t rows) {
 }
 
 void Grid::setFormatString(std::string_view format) {
+    std::vector<std::string_view> parts;
+    if (!format.empty())
+        parts = Split(format, '|');
+    CheckCells(name(), std::max<int64_t>(Rows(), 1), static_cast<int64_t>(parts.size()));
     format_ = std::string(format);
     alignment_.clear();
     widthChars_.clear();
     std::vector<std::string> headings;
-    if (!format.empty()) {
-        for (std::string_view part : Split(format, '|')) {
-            int32_t alignment = part.empty() ? kAlignGeneral : AlignmentOfPrefix(part.front());
-            if (alignment != kAlignGeneral)
-                part.remove_prefix(1);
-            alignment_.push_back(alignment);
-            widthChars_.push_back(static_cast<int32_t>(part.size()));
-            headings.emplace_back(part);
-        }
+    for (std::string_view part : parts) {
+        int32_t alignment = part.empty() ? kAlignGeneral : AlignmentOfPrefix(part.front());
+        if (alignment != kAlignGeneral)
+            part.remove_prefix(1);
+        alignment_.push_back(alignment);
+        widthChars_.push_back(static_cast<int32_t>(part.size()));
+        headings.emplace_back(part);
     }
     cols_ = static_cast<int32_t>(headings.size());
     for (auto& row : cells_)
@@ -89,6 +102,7 @@ void Grid::setFormatString(std::string_view format) {
 void Grid::setFixedRows(int32_t rows) {
     if (rows < 0 || rows > kMaxRows)
         throw Error("Grid " + name() + ": invalid heading row count " + std::to_string(rows));
+    CheckCells(name(), std::max(rows, Rows()), cols_);
     if (rows > Rows())
         cells_.resize(static_cast<size_t>(rows),
                       std::vector<std::string>(static_cast<size_t>(cols_)));
@@ -133,6 +147,7 @@ void Grid::AddItem(std::string_view text, int32_t index) {
                     std::to_string(Rows()));
     if (Rows() >= kMaxRows)
         throw Error("Grid " + name() + ": too many rows");
+    CheckCells(name(), int64_t{Rows()} + 1, cols_);
     std::vector<std::string> row(static_cast<size_t>(cols_));
     std::vector<std::string_view> parts = Split(text, '\t');
     for (size_t col = 0; col < row.size() && col < parts.size(); ++col)

@@ -82,6 +82,27 @@ TEST(GridTest, CellsAndColumnsOutsideTheGridAreErrors) {
     EXPECT_THROW(grid.ColWidthChars(2), Error);
 }
 
+// Many columns must not let the row limit alone take gigabytes: the cell
+// count is limited too, and a refused change leaves the grid as it was.
+TEST(GridTest, TooManyCellsAreAnErrorThatChangesNothing) {
+    Grid wide("wide");
+    wide.setFormatString(std::string(99, '|'));
+    ASSERT_EQ(wide.Cols(), 100);
+    EXPECT_THROW(wide.setRows(100000), Error);
+    EXPECT_THROW(wide.setFixedRows(100000), Error);
+    EXPECT_EQ(wide.Rows(), 1);
+    EXPECT_EQ(wide.FixedRows(), 0);
+
+    Grid tall("tall");
+    tall.setRows(1000000);
+    EXPECT_THROW(tall.setFormatString("1|2|3|4|5|6|7|8|9"), Error);
+    EXPECT_EQ(tall.Cols(), 0);
+    EXPECT_EQ(tall.FormatString(), "");
+    tall.setRows(10);
+    tall.setFormatString("1|2|3|4|5|6|7|8|9");
+    EXPECT_EQ(tall.TextMatrix(0, 8), "9");
+}
+
 TEST(GridTest, CurrentRowAndHeadingRows) {
     Grid grid("ItemPicLines");
     grid.setFixedRows(1);
