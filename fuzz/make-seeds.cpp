@@ -114,6 +114,23 @@ void ItemSeeds(const fs::path& out, const fs::path& company, int index) {
     }
 }
 
+// Record length - 1, block choice, reads; then the file.
+void RecordSeeds(const fs::path& out, const fs::path& company, int index) {
+    const std::pair<const char*, int> files[] = {
+        {"ISHP.FIX", 170}, {"ITM.fix", 500}, {"ACT.fix", 650}, {"adf.fix", 7495}};
+    int n = 0;
+    for (const auto& [name, length] : files) {
+        if (!fs::exists(company / name))
+            continue;
+        std::string file = ReadAll(company / name).substr(0, 3000);
+        int small = length > 256 ? 99 : length;
+        std::string reads = std::string{3, 2, 0, 1, 0, static_cast<char>(0xFF), static_cast<char>(0xFF)};
+        for (char block : {char(0), char(10), char(0xFF)})
+            Write(out / "recordfile", "company" + std::to_string(index) + "-" + std::to_string(n++),
+                  std::string{static_cast<char>(small - 1), block} + reads + file);
+    }
+}
+
 void TextSeeds(const fs::path& out) {
     const std::string texts[] = {
         DosVisual("שלום עולם"), DosVisual("רח' הרצל 45 (פינה)"), DosVisual("Widget Pro 3 ב-5"),
@@ -144,6 +161,7 @@ int main(int argc, char** argv) {
             if (fs::exists(company / "ISHP.FIX"))
                 StockSeeds(out, ReadAll(company / "ISHP.FIX"), index);
             ItemSeeds(out, company, index);
+            RecordSeeds(out, company, index);
             ++index;
         }
         TextSeeds(out);
