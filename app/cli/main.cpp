@@ -1,4 +1,5 @@
 #include "app/cli/HostSession.h"
+#include "app/cli/SettingsCommand.h"
 #include "app/cli/ShowCommand.h"
 
 #include <CLI/CLI.hpp>
@@ -41,6 +42,29 @@ void AddHost(CLI::App& app, Runner& run) {
         [&run] { run = [] { return dovrel::HostSession().serve(std::cin, std::cout); }; });
 }
 
+void AddSettings(CLI::App& app, Runner& run) {
+    auto options = std::make_shared<dovrel::SettingsOptions>();
+    CLI::App* settings = app.add_subcommand("settings", "List, read, save or remove settings");
+    settings->add_option("--app", options->app, "Application name (default Dovrel)");
+    settings->require_subcommand(1);
+    settings->fallthrough();
+    settings->add_subcommand("list", "Print every KEY=VALUE");
+    settings->add_subcommand("get", "Print the value of a key")
+        ->add_option("KEY", options->key)
+        ->required();
+    CLI::App* set = settings->add_subcommand("set", "Save a value under a key");
+    set->add_option("KEY", options->key)->required();
+    set->add_option("VALUE", options->value)->required();
+    settings->add_subcommand("unset", "Remove a key")->add_option("KEY", options->key)->required();
+    settings->callback([options, settings, &run] {
+        options->action = settings->get_subcommands().front()->get_name();
+        run = [options] {
+            dovrel::SqliteSettingsStore store;
+            return dovrel::SettingsCommand(*options, store).run(std::cout, std::cerr);
+        };
+    });
+}
+
 } // namespace
 
 int main(int argc, char** argv) {
@@ -49,6 +73,7 @@ int main(int argc, char** argv) {
     Runner run;
     AddShow(app, run);
     AddHost(app, run);
+    AddSettings(app, run);
     try {
         app.parse(argc, argv);
     } catch (const CLI::ParseError& e) {

@@ -1,0 +1,286 @@
+#include "platform/SettingsStore.h"
+
+#include "TestCompany.h"
+#include "platform/Error.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+#include <sqlite3.h>
+
+#include <sys/stat.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <cstdlib>
+#include <fstream>
+#include <functional>
+#include <memory>
+#include <optional>
+#include <sstream>
+#include <thread>
+
+namespace dovrel {
+namespace {
+
+using test::W;
+using ::testing::ElementsAre;
+using ::testing::HasSubstr;
+using ::testing::Pair;
+
+// The same behaviour is asked of both stores.
+template <typename Store> struct Maker;
+template <> struct Maker<MemorySettingsStore> {
+    std::unique_ptr<SettingsStore> make() { return std::make_unique<MemorySettingsStore>(); }
+};
+template <> struct Maker<SqliteSettingsStore> {
+    test::TempDir dir;
+    std::unique_ptr<SettingsStore> make() {
+        return std::make_unique<SqliteSettingsStore>(dir.str() + "/dovrel/settings.db");
+    }
+};
+
+template <typename Store> class EveryStoreTest : public ::testing::Test {
+protected:
+    Maker<Store> maker;
+    std::unique_ptr<SettingsStore> store = maker.make();
+};
+using Stores = ::testing::Types<MemorySettingsStore, SqliteSettingsStore>;
+TYPED_TEST_SUITE(EveryStoreTest, Stores);
+
+TYPED_TEST(EveryStoreTest, KeepsHebrewTextAndMatchesNamesWithoutCase) {
+    SettingsStore& s = *this->store;
+    const std::string path = W("c:\\חברה 02"), title = W("חשבונית מס ₪");
+    EXPECT_EQ(s.GetSetting("Dovrel", "Params", "CompPath", "c:\\comp02"), "c:\\comp02");
+    EXPECT_EQ(s.FindSetting("Dovrel", "Params", "CompPath"), std::nullopt);
+    s.SaveSetting("Dovrel", "Params", "CompPath", path);
+    s.SaveSetting("Dovrel", "Params", "Title", title);
+    s.SaveSetting("Dovrel", "Params", "Empty", "");
+    EXPECT_EQ(s.GetSetting("DOVREL", "params", "comppath", ""), path);
+    EXPECT_EQ(s.FindSetting("dovrel", "Params", "EMPTY"), std::optional<std::string>(""));
+
+    s.SaveSetting("dovrel", "PARAMS", "TITLE", "second");
+    EXPECT_THAT(s.ListSettings("Dovrel", "Params"),
+                ElementsAre(Pair("CompPath", path), Pair("Empty", ""), Pair("Title", "second")));
+    EXPECT_TRUE(s.DeleteSetting("DoVrEl", "pArAmS", "empty"));
+    EXPECT_FALSE(s.DeleteSetting("Dovrel", "Params", "Empty"));
+    EXPECT_THROW(s.SaveSetting("Dovrel", "Params", "", "x"), Error);
+}
+
+TYPED_TEST(EveryStoreTest, KeepsApplicationsAndSectionsApartAndSortsKeysWithoutCase) {
+    SettingsStore& s = *this->store;
+    const std::string hebrewKey = W("מפתח");
+    for (const char* key : {"b", "C", "A"})
+        s.SaveSetting("Dovrel", "Params", key, key);
+    s.SaveSetting("Dovrel", "Params", hebrewKey, "h");
+    s.SaveSetting("Dovrel7", "Params", "b", "other app");
+    s.SaveSetting("Dovrel", "Other", "b", "other section");
+    EXPECT_THAT(s.ListSettings("dovrel", "params"),
+                ElementsAre(Pair("A", "A"), Pair("b", "b"), Pair("C", "C"), Pair(hebrewKey, "h")));
+    EXPECT_THAT(s.ListSettings("Dovrel7", "Params"), ElementsAre(Pair("b", "other app")));
+    EXPECT_EQ(s.GetSetting("Dovrel", "other", "B", ""), "other section");
+    EXPECT_EQ(s.GetSetting("Dovrel", "Params", hebrewKey, ""), "h");
+    EXPECT_TRUE(s.ListSettings("Dovrel8", "Params").empty());
+    EXPECT_FALSE(s.DeleteSetting("Dovrel8", "Params", "b"));
+}
+
+// Runs work and gives its Error's description, or nothing when it succeeded.
+std::optional<std::string> FailureOf(const std::function<void()>& work) {
+    try {
+        work();
+        return std::nullopt;
+    } catch (const Error& e) {
+        return e.what();
+    }
+}
+
+// The same, where file modes matter: when the tests run as root, which they do not stop, the
+// work runs in a child process as "nobody".
+std::optional<std::string> FailureAsUser(const std::function<void()>& work) {
+    if (geteuid() != 0)
+        return FailureOf(work);
+    int fds[2];
+    if (pipe(fds) != 0)
+        return "pipe failed";
+    pid_t child = fork();
+    if (child == 0) {
+        close(fds[0]);
+        std::string answer = "-";
+        if (setgid(65534) != 0 || setuid(65534) != 0)
+            answer = "!cannot become nobody";
+        else
+            try {
+                work();
+            } catch (const Error& e) {
+                answer = std::string("E") + e.what();
+            }
+        ssize_t written = write(fds[1], answer.data(), answer.size());
+        _exit(written == static_cast<ssize_t>(answer.size()) ? 0 : 1);
+    }
+    close(fds[1]);
+    std::string answer;
+    char buffer[512];
+    for (ssize_t n; (n = read(fds[0], buffer, sizeof buffer)) > 0;)
+        answer.append(buffer, static_cast<size_t>(n));
+    close(fds[0]);
+    waitpid(child, nullptr, 0);
+    if (answer.empty() || answer[0] == '!')
+        return "child failed: " + answer;
+    return answer[0] == 'E' ? std::optional(answer.substr(1)) : std::nullopt;
+}
+
+mode_t ModeOf(const std::filesystem::path& path) {
+    struct stat info {};
+    return stat(path.c_str(), &info) == 0 ? info.st_mode & 07777 : 0;
+}
+
+class SqliteStoreTest : public ::testing::Test {
+protected:
+    test::TempDir dir;
+    std::filesystem::path file = dir.path() / "cfg" / "dovrel" / "settings.db";
+    SqliteSettingsStore store{file.string()};
+};
+
+TEST_F(SqliteStoreTest, ReadsCreateNothingAndTheFirstSaveMakesAPrivateFile) {
+    EXPECT_EQ(store.GetSetting("Dovrel", "Params", "CompPath", "c:\\comp02"), "c:\\comp02");
+    EXPECT_TRUE(store.ListSettings("Dovrel", "Params").empty());
+    EXPECT_FALSE(store.DeleteSetting("Dovrel", "Params", "CompPath"));
+    EXPECT_FALSE(std::filesystem::exists(dir.path() / "cfg"));
+
+    store.SaveSetting("Dovrel", "Params", "CompPath", "d:\\x");
+    EXPECT_EQ(ModeOf(dir.path() / "cfg"), 0700u);
+    EXPECT_EQ(ModeOf(file.parent_path()), 0700u);
+    EXPECT_EQ(ModeOf(file), 0600u);
+    EXPECT_EQ(SqliteSettingsStore(file.string()).GetSetting("Dovrel", "Params", "comppath", ""),
+              "d:\\x");
+}
+
+TEST_F(SqliteStoreTest, TwoConnectionsOnOneFileTheLastSaveWinsKeyByKey) {
+    SqliteSettingsStore other(file.string());
+    store.SaveSetting("Dovrel", "Params", "CompPath", "a1");
+    other.SaveSetting("Dovrel", "Params", "Title", "b1");
+    store.SaveSetting("Dovrel", "Params", "title", "a2");
+    other.SaveSetting("Dovrel", "Params", "COMPPATH", "b2");
+    for (SqliteSettingsStore* s : {&store, &other})
+        EXPECT_THAT(s->ListSettings("Dovrel", "Params"),
+                    ElementsAre(Pair("CompPath", "b2"), Pair("Title", "a2")));
+
+    // Saves from two threads at once wait for each other instead of failing.
+    auto saveMany = [this](const std::string& prefix) {
+        SqliteSettingsStore own(file.string());
+        for (int i = 0; i < 25; ++i)
+            own.SaveSetting("Busy", "Params", prefix + std::to_string(i), prefix);
+    };
+    std::thread first(saveMany, "x"), second(saveMany, "y");
+    first.join();
+    second.join();
+    EXPECT_EQ(store.ListSettings("Busy", "Params").size(), 50u);
+}
+
+TEST_F(SqliteStoreTest, DefaultPathFollowsTheXdgRules) {
+    auto keep = [](const char* name) {
+        const char* value = std::getenv(name);
+        return value ? std::optional<std::string>(value) : std::nullopt;
+    };
+    std::optional<std::string> config = keep("XDG_CONFIG_HOME"), home = keep("HOME");
+    setenv("HOME", "/home/dana", 1);
+    setenv("XDG_CONFIG_HOME", "/srv/conf/", 1);
+    EXPECT_EQ(SqliteSettingsStore::DefaultPath(), "/srv/conf/dovrel/settings.db");
+    setenv("XDG_CONFIG_HOME", "relative/conf", 1);
+    EXPECT_EQ(SqliteSettingsStore::DefaultPath(), "/home/dana/.config/dovrel/settings.db");
+    setenv("XDG_CONFIG_HOME", "", 1);
+    EXPECT_EQ(SqliteSettingsStore::DefaultPath(), "/home/dana/.config/dovrel/settings.db");
+    unsetenv("XDG_CONFIG_HOME");
+    EXPECT_EQ(SqliteSettingsStore().path(), "/home/dana/.config/dovrel/settings.db");
+    for (auto [name, value] : {std::pair{"XDG_CONFIG_HOME", config}, std::pair{"HOME", home}})
+        value ? setenv(name, value->c_str(), 1) : unsetenv(name);
+}
+
+TEST_F(SqliteStoreTest, ADamagedFileOrADirectoryIsAnErrorNamingTheFile) {
+    std::filesystem::create_directories(file.parent_path());
+    const std::string garbage(3000, '\x5a');
+    std::ofstream(file, std::ios::binary) << garbage;
+    std::function<void()> get = [this] {
+        store.GetSetting("Dovrel", "Params", "CompPath", "default");
+    };
+    std::function<void()> save = [this] { store.SaveSetting("Dovrel", "Params", "CompPath", "x"); };
+    std::function<void()> list = [this] { store.ListSettings("Dovrel", "Params"); };
+    std::function<void()> remove = [this] { store.DeleteSetting("Dovrel", "Params", "CompPath"); };
+    EXPECT_THAT(FailureOf(get).value_or(""), HasSubstr("Cannot read setting \"CompPath\" from " +
+                                                       file.string() + ": file is not a database"));
+    for (const auto& work : {save, list, remove})
+        EXPECT_THAT(FailureOf(work).value_or(""), HasSubstr(file.string()));
+    std::ostringstream kept;
+    kept << std::ifstream(file, std::ios::binary).rdbuf();
+    EXPECT_EQ(kept.str(), garbage);
+
+    std::filesystem::remove(file);
+    std::filesystem::create_directory(file);
+    for (const auto& work : {get, save, list, remove})
+        EXPECT_THAT(FailureOf(work).value_or(""), HasSubstr(file.string()));
+}
+
+TEST_F(SqliteStoreTest, AReadOnlyDirectoryFailsTheSaveAndLosesNothing) {
+    std::filesystem::create_directories(dir.path() / "cfg");
+    chmod((dir.path() / "cfg").c_str(), 0555);
+    EXPECT_THAT(FailureAsUser([this] {
+                    store.SaveSetting("Dovrel", "Params", "CompPath", "x");
+                }).value_or(""),
+                HasSubstr("Cannot save setting \"CompPath\" to " + file.string() +
+                          ": cannot create the directory " + file.parent_path().string()));
+    chmod((dir.path() / "cfg").c_str(), 0755);
+
+    store.SaveSetting("Dovrel", "Params", "CompPath", "kept");
+    chmod(file.c_str(), 0444);
+    chmod(file.parent_path().c_str(), 0555);
+    EXPECT_THAT(FailureAsUser([this] {
+                    store.SaveSetting("Dovrel", "Params", "CompPath", "new");
+                }).value_or(""),
+                HasSubstr("Cannot save setting \"CompPath\" to " + file.string() +
+                          ": attempt to write a readonly database"));
+    EXPECT_EQ(FailureAsUser([this] { store.GetSetting("Dovrel", "Params", "CompPath", ""); }),
+              std::nullopt);
+    chmod(file.parent_path().c_str(), 0700);
+    EXPECT_EQ(store.GetSetting("Dovrel", "Params", "CompPath", ""), "kept");
+}
+
+// Another connection that holds a write transaction on the file.
+class Holder {
+public:
+    explicit Holder(const std::string& path) { sqlite3_open(path.c_str(), &db_); }
+    ~Holder() { sqlite3_close(db_); }
+    int exec(const char* sql) { return sqlite3_exec(db_, sql, nullptr, nullptr, nullptr); }
+
+private:
+    sqlite3* db_ = nullptr;
+};
+
+TEST_F(SqliteStoreTest, ALockHeldPastTheTimeoutFailsAndLosesNothing) {
+    store.SaveSetting("Dovrel", "Params", "CompPath", "old");
+    store.SaveSetting("Dovrel", "Params", "Title", "old title");
+    store.setBusyTimeout(std::chrono::milliseconds(50));
+    Holder holder(file.string());
+    ASSERT_EQ(holder.exec("BEGIN IMMEDIATE; UPDATE settings SET value = 'held'"), SQLITE_OK);
+    EXPECT_THROW(
+        {
+            try {
+                store.SaveSetting("Dovrel", "Params", "CompPath", "new");
+            } catch (const Error& e) {
+                EXPECT_THAT(e.what(), HasSubstr(file.string() + ": database is locked"));
+                throw;
+            }
+        },
+        Error);
+    EXPECT_THROW(store.DeleteSetting("Dovrel", "Params", "Title"), Error);
+    // Readers still see the last committed values while the other writes.
+    EXPECT_EQ(store.GetSetting("Dovrel", "Params", "CompPath", ""), "old");
+
+    ASSERT_EQ(holder.exec("ROLLBACK; BEGIN EXCLUSIVE"), SQLITE_OK);
+    EXPECT_THROW(store.GetSetting("Dovrel", "Params", "CompPath", "default"), Error);
+    EXPECT_THROW(store.ListSettings("Dovrel", "Params"), Error);
+    ASSERT_EQ(holder.exec("ROLLBACK"), SQLITE_OK);
+    EXPECT_THAT(store.ListSettings("Dovrel", "Params"),
+                ElementsAre(Pair("CompPath", "old"), Pair("Title", "old title")));
+}
+
+} // namespace
+} // namespace dovrel
