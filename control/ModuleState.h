@@ -4,14 +4,17 @@
 #include "fixfiles/CompanyFile.h"
 #include "fixfiles/CurrentDocument.h"
 #include "fixfiles/DocTypes.h"
+#include "platform/Form.h"
 
+#include <map>
+#include <memory>
 #include <string>
 
 namespace dovrel {
 
 // The state every control of a thread shares: the company directory, the
-// settings name, the document-type tables, the current document, the
-// accounts and the company record. Each Card keeps only its own position and
+// settings name, the picture paths, the document-type tables, the current
+// document, the accounts, the company record and the side forms. Each Card keeps only its own position and
 // search. This is the one piece of module-wide state; there is one per thread.
 struct ModuleState {
     std::string CompDir;
@@ -21,6 +24,12 @@ struct ModuleState {
     CurrentDocument Doc;
     AccountsTable Accounts;
     CompanyRecord Company;
+    // Directories of the picture database and of the pictures, each ending
+    // in a separator.
+    std::string DBPath;
+    std::string PicPath;
+    // The side forms by name, each made on first use and kept.
+    std::map<std::string, std::unique_ptr<Form>> Forms;
 
     // The state of the calling thread, made on first use.
     static ModuleState& ofThisThread();

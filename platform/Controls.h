@@ -24,10 +24,14 @@ public:
 
     const std::string& name() const { return name_; }
     ControlKind kind() const { return kind_; }
+    // The text a label, button or check box shows (code page 1255).
+    const std::string& Caption() const { return caption_; }
+    void setCaption(std::string caption) { caption_ = std::move(caption); }
 
 private:
     std::string name_;
     ControlKind kind_;
+    std::string caption_;
 };
 
 // A text box. Setting a different text announces the change, as typing would;
@@ -116,6 +120,18 @@ public:
 
 private:
     int32_t value_ = 0;
+};
+
+// A caption label or a command button: a caption and nothing else; what a
+// click does belongs to the control or form that owns them.
+class Label : public Control {
+public:
+    explicit Label(std::string name) : Control(std::move(name), ControlKind::Label) {}
+};
+
+class Button : public Control {
+public:
+    explicit Button(std::string name) : Control(std::move(name), ControlKind::Button) {}
 };
 
 } // namespace dovrel

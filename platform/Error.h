@@ -17,4 +17,14 @@ public:
 // "<what> <path>: <reason>".
 [[noreturn]] void ThrowSystemError(const std::string& what, const std::string& path, int err);
 
+// Runs step and ignores any failure in it: the handlers that go on with
+// their next step after a failure run each step through this.
+template <typename Step>
+void IgnoringErrors(Step&& step) noexcept {
+    try {
+        step();
+    } catch (...) {
+    }
+}
+
 } // namespace dovrel

@@ -2,11 +2,26 @@
 
 #include "platform/Error.h"
 
+#include <cctype>
 #include <charconv>
+#include <cstdint>
 #include <cmath>
 #include <cstdio>
 
 namespace dovrel {
+
+namespace {
+
+bool EqualsIgnoringCase(const std::string& text, const char* word) {
+    size_t i = 0;
+    for (; i < text.size() && word[i] != '\0'; ++i)
+        if (std::tolower(static_cast<unsigned char>(text[i])) !=
+            std::tolower(static_cast<unsigned char>(word[i])))
+            return false;
+    return i == text.size() && word[i] == '\0';
+}
+
+} // namespace
 
 Variant Variant::Null() {
     Variant v;
@@ -87,6 +102,51 @@ double Variant::toNumber() const {
     if (ec != std::errc() || ptr != end || !std::isfinite(number))
         throw Error("Type mismatch");
     return number;
+}
+
+int64_t RoundToWhole(double value, int64_t min, int64_t max) {
+    if (!std::isfinite(value))
+        throw Error("Overflow");
+    double rounded = std::nearbyint(value);  // the default mode rounds halves to even
+    if (rounded < static_cast<double>(min) || rounded > static_cast<double>(max))
+        throw Error("Overflow");
+    return static_cast<int64_t>(rounded);
+}
+
+int32_t Variant::toInt32() const {
+    return static_cast<int32_t>(RoundToWhole(toNumber(), INT32_MIN, INT32_MAX));
+}
+
+int16_t Variant::toInt16() const {
+    return static_cast<int16_t>(RoundToWhole(toNumber(), INT16_MIN, INT16_MAX));
+}
+
+uint8_t Variant::toByte() const {
+    return static_cast<uint8_t>(RoundToWhole(toNumber(), 0, UINT8_MAX));
+}
+
+bool Variant::toBool() const {
+    if (kind() == Kind::Boolean)
+        return std::get<bool>(value_);
+    if (kind() == Kind::Text) {
+        const std::string& text = std::get<std::string>(value_);
+        if (EqualsIgnoringCase(text, "True"))
+            return true;
+        if (EqualsIgnoringCase(text, "False"))
+            return false;
+    }
+    return toNumber() != 0;
+}
+
+bool Variant::isNumeric() const {
+    if (kind() != Kind::Text && kind() != Kind::Number)
+        return false;
+    try {
+        toNumber();
+        return true;
+    } catch (const Error&) {
+        return false;
+    }
 }
 
 } // namespace dovrel

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstdint>
 #include <string>
 #include <variant>
 
@@ -31,6 +32,17 @@ public:
     // spaces allowed), empty counts as 0, a boolean as -1 or 0. Null and
     // other text are errors ("Type mismatch").
     double toNumber() const;
+    // The value as a whole number of the given width, as the host's type
+    // conversion gives it: rounded to the nearest, halves to even (10.5 -> 10,
+    // 11.5 -> 12); out of range is an error ("Overflow").
+    int32_t toInt32() const;
+    int16_t toInt16() const;
+    uint8_t toByte() const;
+    // The value as a flag: a number is true unless 0; text "True"/"False"
+    // (any case) or a number; other text is an error ("Type mismatch").
+    bool toBool() const;
+    // True when toNumber would succeed on a text or number.
+    bool isNumeric() const;
 
     bool operator==(const Variant&) const = default;
 
@@ -45,5 +57,9 @@ private:
 // with no grouping and no trailing zeros ("2", "1.5", "-0.25"). Very large
 // or very small magnitudes use an exponent ("1E+20").
 std::string PlainNumber(double value);
+
+// Rounds to the nearest whole number, halves to even, and checks the result
+// lies within [min, max] ("Overflow" otherwise).
+int64_t RoundToWhole(double value, int64_t min, int64_t max);
 
 } // namespace dovrel

@@ -69,8 +69,19 @@ nlohmann::json CardMembers::Get(Card& card, const std::string& name) {
     return StateJson::ControlValue(Find(card, name));
 }
 
+Form& CardMembers::FindForm(Card& card, const std::string& name) {
+    auto& forms = card.shared().Forms;
+    auto found = forms.find(name);
+    if (found == forms.end() || !found->second)
+        throw Error("Form " + name + " is not loaded");
+    return *found->second;
+}
+
 Control& CardMembers::Find(Card& card, const std::string& name) {
-    Control* control = card.findControl(name);
+    size_t dot = name.find('.');
+    Control* control = dot == std::string::npos
+                           ? card.findControl(name)
+                           : FindForm(card, name.substr(0, dot)).findControl(name.substr(dot + 1));
     if (control == nullptr)
         throw Error("Unknown member or control: " + name);
     return *control;

@@ -11,16 +11,20 @@ namespace dovrel {
 // Reads and writes a Card's public members and child controls by name, with
 // JSON values: the four Pub members, the text of a text box, the position of
 // a list (-1 for none), the value of a check box. Getting also gives a
-// shape's width and a grid's cells. A wrong name or value is an Error.
+// shape's width, a grid's cells and a caption. "FORM.CONTROL" names a
+// control of a loaded side form. A wrong name or value is an Error.
 class CardMembers {
 public:
     static void Set(Card& card, const std::string& name, const nlohmann::json& value);
     static nlohmann::json Get(Card& card, const std::string& name);
     static void SetControl(Control& control, const nlohmann::json& value);
+    // The control of the card, or of a loaded form for "FORM.CONTROL".
+    static Control& Find(Card& card, const std::string& name);
+    // The loaded form of that name.
+    static Form& FindForm(Card& card, const std::string& name);
 
 private:
     static bool SetPub(Card& card, const std::string& name, const nlohmann::json& value);
-    static Control& Find(Card& card, const std::string& name);
 };
 
 } // namespace dovrel

@@ -2,6 +2,7 @@
 
 #include "app/cli/CardMembers.h"
 #include "app/cli/StateJson.h"
+#include "control/CardInterface.h"
 #include "fixfiles/AccountsFile.h"
 #include "fixfiles/CompanyFile.h"
 #include "fixfiles/TextDecoding.h"
@@ -30,9 +31,37 @@ json Failure(const std::string& description) {
 
 } // namespace
 
-HostSession::HostSession(ModuleState& shared) : card_(messages_, shared) {
+HostSession::HostSession(ModuleState& shared)
+    : HostSession(std::make_unique<MemorySettingsStore>(), shared) {}
+
+HostSession::HostSession(std::unique_ptr<SettingsStore> settings, ModuleState& shared)
+    : settings_(std::move(settings)), forms_([this](const json& request) { run(request); }),
+      shared_(shared) {
     addCardCommands();
+    addEventCommands();
     addFileCommands();
+    newCard(0, json::object());
+}
+
+HostSession::~HostSession() = default;
+
+void HostSession::newCard(size_t slot, const json& elements) {
+    if (!elements.is_object())
+        throw Error("The page elements must be a JSON object");
+    std::map<std::string, std::string> values;
+    for (const auto& [id, value] : elements.items())
+        values[id] = value.is_string() ? HostArgs::Text(value, id) : value.dump();
+    ElementsContainer container(std::move(values));
+    CardServices services{messages_, *settings_, forms_, clipboard_};
+    cards_[slot] = std::make_unique<Card>(services, shared_);
+    current_ = slot;
+    cards_[slot]->UserControl_InitProperties(&container);
+}
+
+void HostSession::use(size_t slot) {
+    if (!cards_[slot])
+        throw Error("There is no control " + std::to_string(slot + 1) + "; make it with new2");
+    current_ = slot;
 }
 
 void HostSession::addCommand(const std::string& name, Command command) {
@@ -53,10 +82,12 @@ std::optional<std::string> HostSession::handle(std::string_view line) {
     } catch (...) {
         reply = Failure("Unknown failure");
     }
+    if (!reply.contains("state"))
+        reply["messages"] = StateJson::Messages(messages_.take());
     return StateJson::Dump(reply);
 }
 
-json HostSession::answer(const json& request) {
+json HostSession::run(const json& request) {
     if (!request.is_array() || request.empty() || !request[0].is_string())
         throw Error("A request is a JSON array that starts with the command's name");
     const std::string& name = request[0].get_ref<const std::string&>();
@@ -64,11 +95,15 @@ json HostSession::answer(const json& request) {
     if (found == commands_.end())
         throw Error("Unknown command: " + name);
     json args(request.begin() + 1, request.end());
+    return found->second(*this, HostArgs(name, args));
+}
+
+json HostSession::answer(const json& request) {
     messages_.take();
-    json reply = found->second(*this, HostArgs(name, args));
+    json reply = run(request);
     reply["ok"] = true;
     reply["messages"] = StateJson::Messages(messages_.take());
-    reply["state"] = StateJson::Build(card_);
+    reply["state"] = StateJson::Build(card());
     return reply;
 }
 
@@ -100,6 +135,27 @@ void HostSession::addCardCommands() {
         args.expectCount(0);
         return json::object();
     });
+    addCommand("new", [](HostSession& session, const HostArgs& args) {
+        session.newCard(0, args.size() == 0 ? json::object() : args.at(0));
+        return json::object();
+    });
+    addCommand("new2", [](HostSession& session, const HostArgs& args) {
+        session.newCard(1, args.size() == 0 ? json::object() : args.at(0));
+        return json::object();
+    });
+    addCommand("use", [](HostSession& session, const HostArgs& args) {
+        args.expectCount(1);
+        session.use(static_cast<size_t>(args.integer(0, "control number", 1, 2) - 1));
+        return json::object();
+    });
+    addCommand("call", [](HostSession& session, const HostArgs& args) {
+        std::string member = args.text(0, "member");
+        std::vector<Variant> values;
+        for (size_t i = 1; i < args.size(); ++i)
+            values.push_back(args.scalar(i, "argument"));
+        Variant result = CardInterface::Invoke(session.card(), member, values);
+        return json{{"result", StateJson::FromVariant(result)}};
+    });
     addCommand("ReadStock", [](HostSession& session, const HostArgs& args) {
         args.expectCount(6);
         std::string compPath = args.text(0, "company path");
@@ -111,6 +167,55 @@ void HostSession::addCardCommands() {
         int32_t result =
             session.card().ReadStock(compPath, row, searchBy, searchValue, direction, fromDate);
         return json{{"result", result}};
+    });
+}
+
+void HostSession::addEventCommands() {
+    using Event = void (Card::*)(const std::string&);
+    using FormEvent = void (Form::*)(const std::string&);
+    auto event = [this](const char* name, Event onCard, FormEvent onForm) {
+        addCommand(name, [onCard, onForm](HostSession& session, const HostArgs& args) {
+            args.expectCount(1);
+            std::string target = args.text(0, "control");
+            size_t dot = target.find('.');
+            if (dot == std::string::npos) {
+                (session.card().*onCard)(target);
+            } else {
+                Form& form = CardMembers::FindForm(session.card(), target.substr(0, dot));
+                std::string control = target.substr(dot + 1);
+                if (form.findControl(control) == nullptr)
+                    throw Error("Unknown control: " + target);
+                if (onForm)
+                    (form.*onForm)(control);
+            }
+            return json::object();
+        });
+    };
+    event("click", &Card::Click, &Form::Click);
+    event("dblclick", &Card::DblClick, &Form::DblClick);
+    event("lostfocus", &Card::LostFocus, nullptr);
+    addCommand("modal", [](HostSession& session, const HostArgs& args) {
+        args.expectCount(2);
+        session.forms().queue(args.text(0, "form"), args.at(1));
+        return json::object();
+    });
+    addCommand("answers", [](HostSession& session, const HostArgs& args) {
+        args.expectCount(1);
+        const json& answers = args.at(0);
+        if (!answers.is_array())
+            throw Error("answers: give a JSON array of \"yes\" and \"no\"");
+        for (const json& answer : answers) {
+            std::string word = answer.is_string() ? answer.get<std::string>() : std::string();
+            if (word != "yes" && word != "no")
+                throw Error("answers: each answer is \"yes\" or \"no\"");
+        }
+        for (const json& answer : answers)
+            session.messages().queueAnswer(answer == "yes" ? MsgAnswer::Yes : MsgAnswer::No);
+        return json::object();
+    });
+    addCommand("clipboard", [](HostSession& session, const HostArgs& args) {
+        args.expectCount(0);
+        return json{{"result", StateJson::Text(session.clipboard().GetText())}};
     });
 }
 
@@ -128,11 +233,7 @@ void HostSession::addFileCommands() {
     addCommand("FindAccount", [](HostSession& session, const HostArgs& args) {
         args.expectCount(1);
         AccountEntry entry = FindAccount(session.card().shared().Accounts, args.text(0, "key"));
-        return json{{"result",
-                     {{"Key", StateJson::Text(entry.Key)},
-                      {"Phone", StateJson::Text(entry.Phone)},
-                      {"Details", StateJson::Text(entry.Details)},
-                      {"District", StateJson::Text(entry.District)}}}};
+        return json{{"result", StateJson::Account(entry)}};
     });
     addCommand("ReadAdf", [](HostSession& session, const HostArgs& args) {
         args.expectCount(1);

@@ -1,13 +1,18 @@
 #pragma once
 
 #include "app/cli/HostArgs.h"
+#include "app/cli/HostForms.h"
 #include "control/Card.h"
 #include "control/ModuleState.h"
+#include "platform/Clipboard.h"
 #include "platform/Messages.h"
+#include "platform/SettingsStore.h"
 
+#include <array>
 #include <functional>
 #include <iosfwd>
 #include <map>
+#include <memory>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -16,10 +21,12 @@
 
 namespace dovrel {
 
-// The automation host: one Card driven by JSON requests, one request per
+// The automation host: controls driven by JSON requests, one request per
 // line (an array: the command's name, then its arguments), one answer per
 // line (an object). A failing request answers {"ok": false, "error": ...}
-// and the session goes on.
+// and the session goes on. The session starts with one control, made and
+// started as by ["new", {}]; a second one on the same thread (["new2"]) shares
+// its module state, and ["use", 1 | 2] picks which one later requests go to.
 class HostSession {
 public:
     // A command takes the request's arguments and returns the members it adds
@@ -27,7 +34,11 @@ public:
     // "ok", the message boxes the call showed and the control's state.
     using Command = std::function<nlohmann::json(HostSession&, const HostArgs&)>;
 
+    // Settings kept in memory: nothing the user stored is read or changed.
     explicit HostSession(ModuleState& shared = ModuleState::ofThisThread());
+    HostSession(std::unique_ptr<SettingsStore> settings,
+                ModuleState& shared = ModuleState::ofThisThread());
+    ~HostSession();
 
     // The answer to one input line; nothing for a blank line.
     std::optional<std::string> handle(std::string_view line);
@@ -36,17 +47,31 @@ public:
     int serve(std::istream& in, std::ostream& out);
 
     void addCommand(const std::string& name, Command command);
+    // Runs one request's command and gives the members it adds to the answer.
+    nlohmann::json run(const nlohmann::json& request);
 
-    Card& card() { return card_; }
+    // The control later requests go to.
+    Card& card() { return *cards_[current_]; }
     RecordedMessages& messages() { return messages_; }
+    MemoryClipboard& clipboard() { return clipboard_; }
+    HostForms& forms() { return forms_; }
 
 private:
     nlohmann::json answer(const nlohmann::json& request);
+    // Makes control 1 or 2 afresh, in a container with the given page elements.
+    void newCard(size_t slot, const nlohmann::json& elements);
+    void use(size_t slot);
     void addCardCommands();
+    void addEventCommands();
     void addFileCommands();
 
     RecordedMessages messages_;
-    Card card_;
+    std::unique_ptr<SettingsStore> settings_;
+    MemoryClipboard clipboard_;
+    HostForms forms_;
+    ModuleState& shared_;
+    std::array<std::unique_ptr<Card>, 2> cards_;
+    size_t current_ = 0;
     std::map<std::string, Command> commands_;
 };
 

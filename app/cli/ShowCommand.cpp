@@ -83,24 +83,16 @@ int ShowCommand::run(std::ostream& out, std::ostream& err) {
     return 0;
 }
 
-// The same steps as the control's ShowDoc, with the company's own record
-// read first so that its currency names are shown.
+// The control's own start-up and ShowDoc, with the company's record read
+// first so that its currency names are shown. The start-up's settings are
+// its defaults: what the user saved is neither read nor changed.
 void ShowCommand::read(Card& card) {
+    card.UserControl_InitProperties(nullptr);
     companyRead_ = ReadAdf(compPath_, shared_.Company);
     row_ = DocTypeIndex(shared_.DocTypes, options_.type);
-    if (auto* list = dynamic_cast<ComboBox*>(card.findControl("cmbDocType")))
-        if (row_ < list->ListCount())
-            list->setListIndex(row_);
-    shared_.CompDir = compPath_;
-    if (auto* path = dynamic_cast<TextBox*>(card.findControl("txtCompPath")))
-        path->setText(compPath_);
-    card.PubSearchBy.clear();
-    card.PubSearchValue = Variant(std::string());
-    card.PubPrevLocation = 0;
-    card.PubACTLocation = options_.start - 1;
-    std::string direction = "Next";
-    std::string fromDate = card.txtFromDate.Text();
-    card.ReadStock(compPath_, row_, card.PubSearchBy, card.PubSearchValue, direction, fromDate);
+    int16_t type = options_.type;
+    int32_t start = options_.start;
+    card.ShowDoc(compPath_, type, start);
 }
 
 void ShowCommand::watchProgress(Card& card) {

@@ -17,25 +17,43 @@ json StateJson::Build(const Card& card) {
     state["PubSearchBy"] = Text(card.PubSearchBy);
     state["PubSearchValue"] = FromVariant(card.PubSearchValue);
     state["CompDir"] = Text(shared.CompDir);
-    state["controls"] = Controls(card);
+    state["AppName"] = Text(shared.AppName);
+    state["DBPath"] = Text(shared.DBPath);
+    state["PicPath"] = Text(shared.PicPath);
+    state["controls"] = Controls(card.controls());
     state["grid"] = GridCells(card.DocLines);
     state["progress"] = {{"frame", card.ProgressFrame.Width()},
                          {"fill", card.ProgressFill.Width()}};
     state["doc"] = Document(shared.Doc);
     state["accounts"] = {{"count", shared.Accounts.AccountCount},
-                         {"loaded", shared.Accounts.AccountsLoaded}};
+                         {"loaded", shared.Accounts.AccountsLoaded},
+                         {"current", Account(shared.Accounts.CurrentAccount)}};
+    state["forms"] = Forms(shared);
     return state;
 }
 
-json StateJson::Controls(const Card& card) {
+// Every control but grids, whose cells are given on their own.
+json StateJson::Controls(const std::vector<Control*>& list) {
     json controls = json::object();
-    for (const Control* control : card.controls()) {
-        ControlKind kind = control->kind();
-        if (kind == ControlKind::TextBox || kind == ControlKind::ComboBox ||
-            kind == ControlKind::CheckBox)
+    for (const Control* control : list)
+        if (control->kind() != ControlKind::Grid)
             controls[control->name()] = ControlValue(*control);
-    }
     return controls;
+}
+
+json StateJson::Forms(const ModuleState& shared) {
+    json forms = json::object();
+    for (const auto& [name, form] : shared.Forms)
+        if (form)
+            forms[name] = {{"visible", form->Visible()}, {"controls", Controls(form->controls())}};
+    return forms;
+}
+
+json StateJson::Account(const AccountEntry& entry) {
+    return {{"Key", Text(entry.Key)},
+            {"Phone", Text(entry.Phone)},
+            {"Details", Text(entry.Details)},
+            {"District", Text(entry.District)}};
 }
 
 json StateJson::ControlValue(const Control& control) {
@@ -52,7 +70,7 @@ json StateJson::ControlValue(const Control& control) {
         return GridCells(static_cast<const Grid&>(control));
     case ControlKind::Label:
     case ControlKind::Button:
-        break;
+        return Text(control.Caption());
     }
     return nullptr;
 }

@@ -22,20 +22,22 @@ public:
 
     // The value of one control: the text of a text box, the position of a
     // list, the value of a check box, the width of a shape, the cells of a
-    // grid.
+    // grid, the caption of a label or button.
     static nlohmann::json ControlValue(const Control& control);
     static nlohmann::json Messages(const std::vector<RecordedMessages::Shown>& shown);
 
     static nlohmann::json Text(std::string_view cp1255);
     static nlohmann::json Number(double value);
     static nlohmann::json FromVariant(const Variant& value);
+    static nlohmann::json Account(const AccountEntry& entry);
 
     // Serialises without failing on bytes that are not UTF-8 (they become
     // U+FFFD); indent -1 gives one line.
     static std::string Dump(const nlohmann::json& value, int indent = -1);
 
 private:
-    static nlohmann::json Controls(const Card& card);
+    static nlohmann::json Controls(const std::vector<Control*>& list);
+    static nlohmann::json Forms(const ModuleState& shared);
     static nlohmann::json GridCells(const Grid& grid);
     static nlohmann::json Document(const CurrentDocument& doc);
     static nlohmann::json Header(const DocumentHeader& header);

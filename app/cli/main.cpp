@@ -39,7 +39,12 @@ void AddHost(CLI::App& app, Runner& run) {
     CLI::App* host = app.add_subcommand(
         "host", "Automation: one JSON request per input line, one JSON answer per output line");
     host->callback(
-        [&run] { run = [] { return dovrel::HostSession().serve(std::cin, std::cout); }; });
+        [&run] {
+            run = [] {
+                dovrel::HostSession session(std::make_unique<dovrel::SqliteSettingsStore>());
+                return session.serve(std::cin, std::cout);
+            };
+        });
 }
 
 void AddSettings(CLI::App& app, Runner& run) {

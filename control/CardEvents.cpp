@@ -1,0 +1,179 @@
+// The handlers of the control's buttons, search labels, lists and the company
+// path box.
+#include "control/Card.h"
+
+#include "fixfiles/AccountsFile.h"
+#include "fixfiles/TextDecoding.h"
+#include "platform/Error.h"
+
+#include <utility>
+
+namespace dovrel {
+
+namespace {
+
+using Handler = void (Card::*)();
+
+// The handler of the named control for one kind of event, or nullptr.
+Handler Find(std::initializer_list<std::pair<const char*, Handler>> table,
+             const std::string& name) {
+    for (const auto& [control, handler] : table)
+        if (name == control)
+            return handler;
+    return nullptr;
+}
+
+} // namespace
+
+void Card::Click(const std::string& name) {
+    if (findControl(name) == nullptr)
+        throw Error("Unknown control: " + name);
+    Handler handler = Find({{"FirstButt", &Card::FirstButt_Click},
+                            {"PrevButt", &Card::PrevButt_Click},
+                            {"NextButt", &Card::NextButt_Click},
+                            {"LastButt", &Card::LastButt_Click},
+                            {"lblDetails", &Card::lblDetails_Click},
+                            {"CmdDir", &Card::CmdDir_Click},
+                            {"CmdParams", &Card::CmdParams_Click},
+                            {"cmdAccount", &Card::cmdAccount_Click},
+                            {"cmdSaveDef", &Card::cmdSaveDef_Click},
+                            {"PrintButt", &Card::PrintButt_Click}},
+                           name);
+    if (handler)
+        (this->*handler)();
+}
+
+void Card::DblClick(const std::string& name) {
+    if (findControl(name) == nullptr)
+        throw Error("Unknown control: " + name);
+    Handler handler = Find({{"Label1", &Card::Label1_DblClick},
+                            {"LblReference1", &Card::LblReference1_DblClick},
+                            {"Label2", &Card::Label2_DblClick},
+                            {"lblItemKey", &Card::lblItemKey_DblClick}},
+                           name);
+    if (handler)
+        (this->*handler)();
+}
+
+void Card::LostFocus(const std::string& name) {
+    if (findControl(name) == nullptr)
+        throw Error("Unknown control: " + name);
+    Handler handler = Find({{"cmbDocType", &Card::cmbDocType_LostFocus},
+                            {"CmbDocLang", &Card::CmbDocLang_LostFocus}},
+                           name);
+    if (handler)
+        (this->*handler)();
+}
+
+void Card::readWith(const char* direction) {
+    auto row = static_cast<int16_t>(cmbDocType.ListIndex());
+    std::string startFrom = direction;
+    std::string fromDate = txtFromDate.Text();
+    ReadStock(shared_.CompDir, row, PubSearchBy, PubSearchValue, startFrom, fromDate);
+}
+
+void Card::search(const char* by, const std::string& value) {
+    PubSearchBy = by;
+    PubSearchValue = Variant(value);
+    readWith("First");
+}
+
+void Card::clearSearch() {
+    PubSearchBy.clear();
+    PubSearchValue = Variant(std::string());
+}
+
+void Card::resetPosition() {
+    PubACTLocation = 2;
+    PubPrevLocation = 0;
+}
+
+void Card::FirstButt_Click() {
+    clearSearch();
+    readWith("First");
+}
+
+void Card::PrevButt_Click() { readWith("Previous"); }
+
+void Card::NextButt_Click() { readWith("Next"); }
+
+void Card::LastButt_Click() { readWith("Last"); }
+
+void Card::Label1_DblClick() { search("AccountKey", txtAccountKey.Text()); }
+
+void Card::LblReference1_DblClick() { search("Reference1", std::string(Trim(txtReference1.Text()))); }
+
+void Card::Label2_DblClick() { search("CustomerName", txtCustomerName.Text()); }
+
+void Card::lblDetails_Click() { search("Details", txtDetails.Text()); }
+
+void Card::lblItemKey_DblClick() { search("ItemKey", txtItemKey.Text()); }
+
+void Card::cmbDocType_LostFocus() {
+    shared_.CompDir = txtCompPath.Text();
+    clearSearch();
+    resetPosition();
+    CmbDocLang_LostFocus();
+}
+
+void Card::CmbDocLang_LostFocus() {
+    IgnoringErrors([&] {
+        switch (CmbDocLang.ListIndex()) {
+        case 1: {
+            int32_t row = cmbDocType.ListIndex();
+            if (row >= 0 && row < kDocTypeRows)
+                txtTitle.setText(shared_.DocTypes[static_cast<size_t>(row)].englishTitle);
+            break;
+        }
+        case 0:
+        case 2:
+            txtTitle.setText(cmbDocType.Text());
+            break;
+        default:
+            break;
+        }
+    });
+}
+
+void Card::txtCompPath_Change() {
+    shared_.CompDir = txtCompPath.Text();
+    resetPosition();
+    clearSearch();
+}
+
+void Card::CmdDir_Click() {
+    services_.forms.ShowModal(form("frmOpenDir"));
+    txtCompPath.setText(shared_.CompDir);
+    txtCompPath_Change();
+}
+
+void Card::CmdParams_Click() { services_.forms.ShowModal(form("frmItemPics")); }
+
+void Card::cmdSaveDef_Click() {
+    uint8_t save = 1;
+    SetGetRegParams(save);
+    shared_.CompDir = txtCompPath.Text();
+}
+
+// Shows the details of the account in the account box, loading the accounts
+// file when it was not loaded yet, and once more when the key is not in it.
+// Every failing step is skipped.
+void Card::cmdAccount_Click() {
+    std::string key(Trim(txtAccountKey.Text()));
+    if (key.empty())
+        return;
+    AccountsTable& accounts = shared_.Accounts;
+    std::string compDir = shared_.CompDir;
+    if (!accounts.AccountsLoaded)
+        IgnoringErrors([&] { ReadACT(compDir); });
+    IgnoringErrors([&] { accounts.CurrentAccount = FindAccount(accounts, key); });
+    if (accounts.CurrentAccount.Key.empty()) {
+        IgnoringErrors([&] { ReadACT(compDir); });
+        IgnoringErrors([&] { accounts.CurrentAccount = FindAccount(accounts, key); });
+    }
+    IgnoringErrors([&] { services_.forms.ShowModal(form("frmAccDetails")); });
+}
+
+void Card::PrintButt_Click() { throw Error("Printing is not available yet"); }
+
+} // namespace dovrel
