@@ -28,8 +28,9 @@ namespace {
 } // namespace
 
 Card::Card(Messages& messages, ModuleState& shared)
-    : own_(std::make_unique<OwnServices>()),
-      services_{messages, own_->settings, own_->forms, own_->clipboard}, shared_(shared) {
+    : own_(std::make_unique<OwnServices>()), services_{messages, own_->settings, own_->forms,
+                                                       own_->clipboard},
+      shared_(shared) {
     buildControls();
 }
 
@@ -67,13 +68,12 @@ void Card::buildControls() {
 
 // The controls that are members of the class, by name.
 Control* Card::ownControl(const std::string& name) {
-    Control* own[] = {&cmbDocType,      &txtCompPath,   &txtReference1, &txtDate,
-                      &txtAccountKey,   &txtCustomerName, &txtAddress1,   &txtAddress2,
-                      &txtDetails,      &txtItemKey,    &DocLines,      &txtTotalVat,
-                      &txtVatValue,     &txtTotal1,     &ProgressFrame, &ProgressFill,
-                      &txtTitle,        &ChkWithDrawing, &CmbDocLang,    &ChkShowTotalFC,
-                      &chkLineDisc,     &ChkUseFName,   &txtFromDate,   &cmbRules,
-                      &ChkShowDetails};
+    Control* own[] = {
+        &cmbDocType,      &txtCompPath, &txtReference1,  &txtDate,    &txtAccountKey,
+        &txtCustomerName, &txtAddress1, &txtAddress2,    &txtDetails, &txtItemKey,
+        &DocLines,        &txtTotalVat, &txtVatValue,    &txtTotal1,  &ProgressFrame,
+        &ProgressFill,    &txtTitle,    &ChkWithDrawing, &CmbDocLang, &ChkShowTotalFC,
+        &chkLineDisc,     &ChkUseFName, &txtFromDate,    &cmbRules,   &ChkShowDetails};
     for (Control* control : own)
         if (control->name() == name)
             return control;
@@ -90,15 +90,15 @@ Control* Card::findControl(const std::string& name) const {
 void Card::UserControl_InitProperties(Container* container) {
     IgnoringErrors([&] { shared_.AppName = "Dovrel"; });
     IgnoringErrors([&] {
-        std::optional<std::string> id = container ? container->ElementValue("SettingID")
-                                                  : std::nullopt;
+        std::optional<std::string> id =
+            container ? container->ElementValue("SettingID") : std::nullopt;
         std::string value = id ? std::string(Trim(*id)) : std::string();
         if (!value.empty() && Variant(value).isNumeric())
             shared_.AppName += value;
     });
     IgnoringErrors([&] {
-        std::optional<std::string> key = container ? container->ElementValue("AccountKey")
-                                                   : std::nullopt;
+        std::optional<std::string> key =
+            container ? container->ElementValue("AccountKey") : std::nullopt;
         std::string value = key ? std::string(Trim(*key)) : std::string();
         if (!value.empty())
             txtAccountKey.setText(value);
@@ -124,11 +124,17 @@ void Card::UserControl_InitProperties(Container* container) {
     IgnoringErrors([&] { form("frmItemPics"); });
 }
 
-Variant Card::SetAccountKey() const { return Variant(txtAccountKey.Text()); }
+Variant Card::SetAccountKey() const {
+    return Variant(txtAccountKey.Text());
+}
 
-void Card::SetAccountKey(const Variant& value) { txtAccountKey.setText(value.toText()); }
+void Card::SetAccountKey(const Variant& value) {
+    txtAccountKey.setText(value.toText());
+}
 
-Variant Card::SetCompDir() const { return Variant(shared_.CompDir); }
+Variant Card::SetCompDir() const {
+    return Variant(shared_.CompDir);
+}
 
 void Card::SetCompDir(const Variant& value) {
     std::string path = value.isNull() ? std::string() : value.toText();
@@ -136,9 +142,13 @@ void Card::SetCompDir(const Variant& value) {
     txtCompPath.setText(path);
 }
 
-Variant Card::ACTLocation() const { return Variant(static_cast<double>(PubACTLocation)); }
+Variant Card::ACTLocation() const {
+    return Variant(static_cast<double>(PubACTLocation));
+}
 
-void Card::ACTLocation(const Variant& value) { PubACTLocation = value.toInt32(); }
+void Card::ACTLocation(const Variant& value) {
+    PubACTLocation = value.toInt32();
+}
 
 void Card::InitCmbDocType() {
     for (int row = 0; row < kFilledDocTypes; ++row)
@@ -154,11 +164,17 @@ int32_t Card::ReadStock(std::string pCompPath, int16_t& pWizFile, std::string& p
                              pStartFrom, pFromDate);
 }
 
-void Card::CreateHTML(std::string&, int16_t&) { NotAvailable("CreateHTML"); }
+void Card::CreateHTML(std::string&, int16_t&) {
+    NotAvailable("CreateHTML");
+}
 
-Variant Card::CompanyTitle() const { return Variant(shared_.Company.title()); }
+Variant Card::CompanyTitle() const {
+    return Variant(shared_.Company.title());
+}
 
-void Card::CompanyTitle(const Variant& value) { shared_.Company.setTitle(value.toText()); }
+void Card::CompanyTitle(const Variant& value) {
+    shared_.Company.setTitle(value.toText());
+}
 
 void Card::selectDocType(int16_t pWizFile) {
     cmbDocType.setListIndex(DocTypeIndex(shared_.DocTypes, pWizFile));
@@ -184,31 +200,49 @@ int32_t Card::SetParams(std::string pCompPath, int16_t& pWizFile, int32_t& pStar
     return 0;
 }
 
-Variant Card::DBPath() const { return Variant(shared_.DBPath); }
+Variant Card::DBPath() const {
+    return Variant(shared_.DBPath);
+}
 
-void Card::DBPath(const Variant& value) { shared_.DBPath = value.toText(); }
+void Card::DBPath(const Variant& value) {
+    shared_.DBPath = value.toText();
+}
 
-Variant Card::PicPath() const { return Variant(shared_.PicPath); }
+Variant Card::PicPath() const {
+    return Variant(shared_.PicPath);
+}
 
-void Card::PicPath(const Variant& value) { shared_.PicPath = value.toText(); }
+void Card::PicPath(const Variant& value) {
+    shared_.PicPath = value.toText();
+}
 
 Variant Card::ReadITM(std::string& CompPath) {
     return dovrel::ReadITM(CompPath, shared_.Doc, {ProgressFrame, ProgressFill});
 }
 
-void Card::FillPicPath(std::string&) { NotAvailable("FillPicPath"); }
+void Card::FillPicPath(std::string&) {
+    NotAvailable("FillPicPath");
+}
 
-void Card::CreateHTMLEng(std::string&, bool&) { NotAvailable("CreateHTMLEng"); }
+void Card::CreateHTMLEng(std::string&, bool&) {
+    NotAvailable("CreateHTMLEng");
+}
 
-std::string Card::CreateAsIs(std::string&) { NotAvailable("CreateAsIs"); }
+std::string Card::CreateAsIs(std::string&) {
+    NotAvailable("CreateAsIs");
+}
 
 Variant Card::ReadACT(std::string& CompPath) {
     return dovrel::ReadACT(CompPath, shared_.Accounts, {ProgressFrame, ProgressFill});
 }
 
-void Card::WriteCell(int16_t&, std::string&) { NotAvailable("WriteCell"); }
+void Card::WriteCell(int16_t&, std::string&) {
+    NotAvailable("WriteCell");
+}
 
-std::string Card::RulesValue() { NotAvailable("RulesValue"); }
+std::string Card::RulesValue() {
+    NotAvailable("RulesValue");
+}
 
 Form& Card::form(const std::string& name) {
     std::unique_ptr<Form>& slot = shared_.Forms[name];

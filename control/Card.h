@@ -85,8 +85,7 @@ public:
     // Moves one property of a control (kind 1 Text, 2 ListIndex, 3 Value) to
     // the settings store (Action 1) or from it (Action 2).
     void SetGetRegParam(uint8_t Action, const std::string& AppName, const std::string& Section,
-                        const std::string& Key, Control& Ctl, uint8_t Kind,
-                        const Variant& Default);
+                        const std::string& Key, Control& Ctl, uint8_t Kind, const Variant& Default);
 
     // The user's events on child controls. A control without a handler for
     // the event ignores it; an unknown name is an error.
@@ -141,7 +140,7 @@ private:
     std::unique_ptr<OwnServices> own_;
     CardServices services_;
     ModuleState& shared_;
-    std::vector<std::unique_ptr<Control>> plain_;  // labels, buttons, frames
+    std::vector<std::unique_ptr<Control>> plain_; // labels, buttons, frames
     std::vector<Control*> controls_;
 };
 

@@ -58,9 +58,9 @@ void Card::DblClick(const std::string& name) {
 void Card::LostFocus(const std::string& name) {
     if (findControl(name) == nullptr)
         throw Error("Unknown control: " + name);
-    Handler handler = Find({{"cmbDocType", &Card::cmbDocType_LostFocus},
-                            {"CmbDocLang", &Card::CmbDocLang_LostFocus}},
-                           name);
+    Handler handler = Find(
+        {{"cmbDocType", &Card::cmbDocType_LostFocus}, {"CmbDocLang", &Card::CmbDocLang_LostFocus}},
+        name);
     if (handler)
         (this->*handler)();
 }
@@ -93,21 +93,37 @@ void Card::FirstButt_Click() {
     readWith("First");
 }
 
-void Card::PrevButt_Click() { readWith("Previous"); }
+void Card::PrevButt_Click() {
+    readWith("Previous");
+}
 
-void Card::NextButt_Click() { readWith("Next"); }
+void Card::NextButt_Click() {
+    readWith("Next");
+}
 
-void Card::LastButt_Click() { readWith("Last"); }
+void Card::LastButt_Click() {
+    readWith("Last");
+}
 
-void Card::Label1_DblClick() { search("AccountKey", txtAccountKey.Text()); }
+void Card::Label1_DblClick() {
+    search("AccountKey", txtAccountKey.Text());
+}
 
-void Card::LblReference1_DblClick() { search("Reference1", std::string(Trim(txtReference1.Text()))); }
+void Card::LblReference1_DblClick() {
+    search("Reference1", std::string(Trim(txtReference1.Text())));
+}
 
-void Card::Label2_DblClick() { search("CustomerName", txtCustomerName.Text()); }
+void Card::Label2_DblClick() {
+    search("CustomerName", txtCustomerName.Text());
+}
 
-void Card::lblDetails_Click() { search("Details", txtDetails.Text()); }
+void Card::lblDetails_Click() {
+    search("Details", txtDetails.Text());
+}
 
-void Card::lblItemKey_DblClick() { search("ItemKey", txtItemKey.Text()); }
+void Card::lblItemKey_DblClick() {
+    search("ItemKey", txtItemKey.Text());
+}
 
 void Card::cmbDocType_LostFocus() {
     shared_.CompDir = txtCompPath.Text();
@@ -147,7 +163,9 @@ void Card::CmdDir_Click() {
     txtCompPath_Change();
 }
 
-void Card::CmdParams_Click() { services_.forms.ShowModal(form("frmItemPics")); }
+void Card::CmdParams_Click() {
+    services_.forms.ShowModal(form("frmItemPics"));
+}
 
 void Card::cmdSaveDef_Click() {
     uint8_t save = 1;
@@ -174,6 +192,8 @@ void Card::cmdAccount_Click() {
     IgnoringErrors([&] { services_.forms.ShowModal(form("frmAccDetails")); });
 }
 
-void Card::PrintButt_Click() { throw Error("Printing is not available yet"); }
+void Card::PrintButt_Click() {
+    throw Error("Printing is not available yet");
+}
 
 } // namespace dovrel

@@ -15,7 +15,9 @@ using Type = CardInterface::Type;
 using Args = std::vector<Variant>;
 using Call = std::function<Variant(Card&, const Args&)>;
 
-Variant Number(double value) { return Variant(value); }
+Variant Number(double value) {
+    return Variant(value);
+}
 
 // Property accessors: no argument reads, one assigns.
 Call Property(std::function<Variant(Card&)> get, std::function<void(Card&, const Variant&)> let) {
@@ -39,9 +41,8 @@ std::map<std::string, Call> MakeCalls() {
                                     [](Card& c, const Variant& v) { c.PubSearchBy = v.toText(); });
     calls["PubSearchValue"] = Property([](Card& c) { return c.PubSearchValue; },
                                        [](Card& c, const Variant& v) { c.PubSearchValue = v; });
-    calls["SetAccountKey"] =
-        Property([](Card& c) { return c.SetAccountKey(); },
-                 [](Card& c, const Variant& v) { c.SetAccountKey(v); });
+    calls["SetAccountKey"] = Property([](Card& c) { return c.SetAccountKey(); },
+                                      [](Card& c, const Variant& v) { c.SetAccountKey(v); });
     calls["SetCompDir"] = Property([](Card& c) { return c.SetCompDir(); },
                                    [](Card& c, const Variant& v) { c.SetCompDir(v); });
     calls["ACTLocation"] = Property([](Card& c) { return c.ACTLocation(); },

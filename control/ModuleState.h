@@ -14,8 +14,8 @@ namespace dovrel {
 
 // The state every control of a thread shares: the company directory, the
 // settings name, the picture paths, the document-type tables, the current
-// document, the accounts, the company record and the side forms. Each Card keeps only its own position and
-// search. This is the one piece of module-wide state; there is one per thread.
+// document, the accounts, the company record and the side forms. Each Card keeps only its own
+// position and search. This is the one piece of module-wide state; there is one per thread.
 struct ModuleState {
     std::string CompDir;
     std::string AppName = "Dovrel";

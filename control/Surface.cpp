@@ -76,8 +76,8 @@ ControlDesign Check(const char* name, const char* captionUtf8, int32_t left, int
     return d;
 }
 
-ControlDesign Plain(const char* name, Kind kind, const char* captionUtf8, int32_t left,
-                    int32_t top, int32_t width, int32_t height) {
+ControlDesign Plain(const char* name, Kind kind, const char* captionUtf8, int32_t left, int32_t top,
+                    int32_t width, int32_t height) {
     ControlDesign d;
     d.name = name;
     d.kind = kind;
@@ -116,8 +116,8 @@ void AddHeader(std::vector<ControlDesign>& s) {
     ControlDesign address2 = Field("txtAddress2", Kind::TextBox, 5880, 1920, 3255, true);
     ControlDesign details = Field("txtDetails", Kind::TextBox, 1980, 1560, 2235);
     ControlDesign itemKey = Field("txtItemKey", Kind::TextBox, 1980, 1920, 2235);
-    for (const ControlDesign& d : {reference, date, account, customer, address1, address2,
-                                   details, itemKey})
+    for (const ControlDesign& d :
+         {reference, date, account, customer, address1, address2, details, itemKey})
         s.push_back(d);
     s.push_back(CaptionLabel("LblReference1", ":אסמכתא", reference, true));
     s.push_back(CaptionLabel("Label15", ":תאריך", date));
@@ -160,8 +160,8 @@ void AddPageOptions(std::vector<ControlDesign>& s) {
     s.push_back(CaptionLabel("Label16", "תבנית ההדפסה:", lang));
     s.push_back(Check("ChkShowTotalFC", "להציג סה\"כ מטח?", 240, 6300, 1695));
     s.push_back(Check("chkLineDisc", "להציג הנחה לשורה?", 3900, 6300, 1935));
-    s.push_back(Check("ChkUseFName", " להציג את תאור הפריט מתוך התאור הלועזי של הפריט?", 6060,
-                      6300, 4215));
+    s.push_back(
+        Check("ChkUseFName", " להציג את תאור הפריט מתוך התאור הלועזי של הפריט?", 6060, 6300, 4215));
     ControlDesign fromDate = Field("txtFromDate", Kind::TextBox, 3780, 6780, 1035);
     fromDate.text = "01/01/1980";
     s.push_back(fromDate);
@@ -187,8 +187,8 @@ void AddDecoration(std::vector<ControlDesign>& s) {
         {8760, 6720, 1575, 420},  {120, 2460, 10215, 2235},
     };
     for (int i = 0; i < 14; ++i)
-        s.push_back(Plain(("Shape" + std::to_string(i + 1)).c_str(), Kind::Shape, "",
-                          frames[i][0], frames[i][1], frames[i][2], frames[i][3]));
+        s.push_back(Plain(("Shape" + std::to_string(i + 1)).c_str(), Kind::Shape, "", frames[i][0],
+                          frames[i][1], frames[i][2], frames[i][3]));
 }
 
 } // namespace

@@ -14,16 +14,16 @@ namespace dovrel {
 struct ControlDesign {
     std::string name;
     ControlKind kind = ControlKind::Label;
-    std::string caption;  // labels, buttons and check boxes
+    std::string caption; // labels, buttons and check boxes
     std::string toolTip;
     int32_t left = 0, top = 0, width = 0, height = 0;
-    std::vector<std::string> entries;  // drop-down lists, in order
-    std::string text;                  // a text box's initial text
-    std::string labelFor;              // a caption label: the control it names
-    std::string picture;               // a button drawn as a picture: which one
-    bool grey = false;                 // button-face background (read-only look)
-    bool bold = false;                 // the clickable search labels
-    uint32_t foreColor = 0;            // 0xRRGGBB
+    std::vector<std::string> entries; // drop-down lists, in order
+    std::string text;                 // a text box's initial text
+    std::string labelFor;             // a caption label: the control it names
+    std::string picture;              // a button drawn as a picture: which one
+    bool grey = false;                // button-face background (read-only look)
+    bool bold = false;                // the clickable search labels
+    uint32_t foreColor = 0;           // 0xRRGGBB
 };
 
 constexpr int32_t kCardDesignWidth = 10440;

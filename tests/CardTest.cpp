@@ -2,11 +2,11 @@
 // navigation, searches, resets, settings and two controls on one thread.
 
 #include "control/Card.h"
+#include "TestCompany.h"
 #include "control/CardInterface.h"
 #include "control/Surface.h"
 #include "platform/Error.h"
 #include "platform/SettingsStore.h"
-#include "TestCompany.h"
 
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
@@ -31,8 +31,12 @@ json Doc(int type, const std::string& account, const std::string& customer,
             {"customer", customer},
             {"reference", reference},
             {"date", date},
-            {"lines", {{{"key", key}, {"description", "פריט"}, {"details", details},
-                        {"price", 10}, {"quantity", 1}}}}};
+            {"lines",
+             {{{"key", key},
+               {"description", "פריט"},
+               {"details", details},
+               {"price", 10},
+               {"quantity", 1}}}}};
 }
 
 // Delivery notes (type 20) at records 2, 8, 11 and 14 of ISHP.FIX, an agent's
@@ -96,8 +100,8 @@ TEST_F(CardTest, FirstRunShowsTheDefaultsAndReadsNoDocument) {
     EXPECT_EQ(U(card->CmbDocLang.Text()), "אנגלית");
     EXPECT_EQ(U(card->cmbRules.Text()), "רשת מלאה");
     EXPECT_EQ(card->ChkShowDetails.Value(), 1);
-    for (const CheckBox* box : {&card->ChkWithDrawing, &card->ChkUseFName, &card->chkLineDisc,
-                                &card->ChkShowTotalFC})
+    for (const CheckBox* box :
+         {&card->ChkWithDrawing, &card->ChkUseFName, &card->chkLineDisc, &card->ChkShowTotalFC})
         EXPECT_EQ(box->Value(), 0) << box->name();
     EXPECT_EQ(card->txtFromDate.Text(), "01/01/1980");
     EXPECT_EQ(card->PubACTLocation, 2);
@@ -219,7 +223,7 @@ TEST_F(CardTest, ARefusedStoredValueStopsTheLoadAtItsRow) {
     card->cmbDocType.setListIndex(4);
     card->SetGetRegParams(load);
     EXPECT_EQ(card->cmbDocType.ListIndex(), -1);
-    card->SetGetRegParams(other);  // neither saves nor loads
+    card->SetGetRegParams(other); // neither saves nor loads
     for (const char* refused : {"3", "x", "", "1e10"}) {
         settings.SaveSetting("Dovrel", "Params", "WithDrawing", refused);
         EXPECT_THROW(card->SetGetRegParams(load), Error) << refused;
@@ -238,7 +242,7 @@ TEST_F(CardTest, ShowDocShowsTheFirstDocumentAtOrAfterThePosition) {
     EXPECT_EQ(card->cmbDocType.ListIndex(), 13);
     EXPECT_EQ(state.CompDir, company.compPath());
     EXPECT_EQ(card->PubPrevLocation, 2);
-    showDoc(*card, 20, 1);  // record 1 holds no document
+    showDoc(*card, 20, 1); // record 1 holds no document
     EXPECT_EQ(shown(*card), "100");
     showDoc(*card, 20, 3);
     EXPECT_EQ(shown(*card), "300");
@@ -266,7 +270,7 @@ TEST_F(CardTest, ButtonsWalkTheTypeAndSearchesStayInForce) {
     auto card = make(state);
     showDoc(*card, 20, 2);
     card->Click("NextButt");
-    EXPECT_EQ(shown(*card), "300");  // the agent's note at record 5 is another type
+    EXPECT_EQ(shown(*card), "300"); // the agent's note at record 5 is another type
     card->Click("NextButt");
     EXPECT_EQ(shown(*card), "400");
     card->Click("PrevButt");
@@ -306,7 +310,7 @@ TEST_F(CardTest, EachLabelSearchesItsBoxOnItsOwnEvent) {
     EXPECT_EQ(shown(*card), "300");
 
     card->txtDetails.setText(W("כחול"));
-    card->DblClick("lblDetails");  // only its single click searches
+    card->DblClick("lblDetails"); // only its single click searches
     EXPECT_EQ(card->PubSearchBy, "Reference1");
     card->Click("lblDetails");
     EXPECT_EQ(card->PubSearchBy, "Details");
@@ -338,9 +342,9 @@ TEST_F(CardTest, ResetsEndTheSearchAndRestartTheWalk) {
     EXPECT_EQ(card->PubSearchBy, "");
     EXPECT_EQ(card->PubACTLocation, 2);
     EXPECT_EQ(card->PubPrevLocation, 0);
-    EXPECT_EQ(card->txtTitle.Text(), "Delivery Note");  // language "אנגלית" from the settings
-    EXPECT_EQ(shown(*card), "100");                     // nothing read
-    card->Click("NextButt");                            // starts at record 3
+    EXPECT_EQ(card->txtTitle.Text(), "Delivery Note"); // language "אנגלית" from the settings
+    EXPECT_EQ(shown(*card), "100");                    // nothing read
+    card->Click("NextButt");                           // starts at record 3
     EXPECT_EQ(shown(*card), "300");
 
     card->CmbDocLang.setListIndex(0);
@@ -408,8 +412,8 @@ TEST_F(CardTest, TheInterfaceCallsMembersByNameWithTheirKinds) {
     auto card = make(state);
     ASSERT_EQ(CardInterface::Members().size(), 24u);
     EXPECT_STREQ(CardInterface::Members()[12].name, "ShowDoc");
-    EXPECT_EQ(CardInterface::Invoke(*card, "showdoc", {Variant(company.compPath()), Variant("20"),
-                                                        Variant(2.0)}),
+    EXPECT_EQ(CardInterface::Invoke(*card, "showdoc",
+                                    {Variant(company.compPath()), Variant("20"), Variant(2.0)}),
               Variant(0.0));
     EXPECT_EQ(shown(*card), "100");
     CardInterface::Invoke(*card, "ACTLocation", {Variant(4.5)});
@@ -457,14 +461,14 @@ TEST_F(CardTest, TwoControlsShareTheCompanyButNotTheirPositions) {
     first->Click("NextButt");
     EXPECT_EQ(first->PubACTLocation, 8);
     second->cmbDocType.setListIndex(13);
-    second->Click("LastButt");  // reads the company the first one chose
+    second->Click("LastButt"); // reads the company the first one chose
     EXPECT_EQ(shown(*second), "500");
     EXPECT_EQ(state.Doc.header.type, 20);
     EXPECT_EQ(first->PubACTLocation, 8);
 
     // A company path set in one is read by the other, whose position stays.
-    test::TestCompany other(json{{"documents", {Doc(20, "2001", "אחר", "900", "2024-01-01",
-                                                       "Z1")}}}.dump());
+    test::TestCompany other(
+        json{{"documents", {Doc(20, "2001", "אחר", "900", "2024-01-01", "Z1")}}}.dump());
     second->SetCompDir(Variant(other.compPath()));
     EXPECT_EQ(first->PubACTLocation, 8);
     first->Click("FirstButt");

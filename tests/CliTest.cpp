@@ -7,6 +7,7 @@
 #include <spawn.h>
 #include <sys/wait.h>
 
+#include <cstdlib>
 #include <fstream>
 #include <sstream>
 #include <string>
@@ -66,6 +67,47 @@ TEST(CliTest, HostAnswersOneLinePerRequest) {
     EXPECT_EQ(nlohmann::json::parse(bad)["ok"], false);
     EXPECT_NE(nlohmann::json::parse(read)["state"]["controls"]["txtDate"], "");
     EXPECT_FALSE(std::getline(lines, read)) << out;
+}
+
+// The host keeps its settings in the user's store: what one host saves, the
+// next one loads, and a refused value stops the load where it stands.
+TEST(CliTest, HostSettingsSurviveFromOneHostToTheNext) {
+    test::TempDir config;
+    std::string saved = getenv("XDG_CONFIG_HOME") ? getenv("XDG_CONFIG_HOME") : "";
+    setenv("XDG_CONFIG_HOME", config.str().c_str(), 1);
+    auto lastState = [](const std::string& requests) {
+        auto [code, out, err] = RunCli({"host"}, requests + "\n[\"state\"]\n");
+        EXPECT_EQ(code, 0) << err;
+        std::string line, last;
+        for (std::istringstream lines(out); std::getline(lines, line);)
+            last = line;
+        return nlohmann::json::parse(last)["state"];
+    };
+    nlohmann::json first = lastState(R"(["set", "txtTitle", "כותרת"])"
+                                     "\n"
+                                     R"(["set", "cmbRules", 2])"
+                                     "\n"
+                                     R"(["click", "cmdSaveDef"])");
+    EXPECT_EQ(first["controls"]["cmbRules"], 2);
+    nlohmann::json second = lastState("");
+    EXPECT_EQ(second["controls"]["txtTitle"], "כותרת");
+    EXPECT_EQ(second["controls"]["cmbRules"], 2);
+    EXPECT_EQ(second["controls"]["CmbDocLang"], 1);
+    nlohmann::json numbered = lastState(R"(["new", {"SettingID": "3"}])");
+    EXPECT_EQ(numbered["AppName"], "Dovrel3");
+    EXPECT_EQ(numbered["controls"]["txtTitle"], "");
+
+    auto [code, out, err] = RunCli({"settings", "set", "DocType", "30"});
+    EXPECT_EQ(code, 0) << err;
+    nlohmann::json stopped = lastState("");
+    EXPECT_EQ(stopped["controls"]["txtCompPath"], "c:\\comp02");
+    EXPECT_EQ(stopped["controls"]["cmbDocType"], 0);
+    EXPECT_EQ(stopped["controls"]["txtTitle"], "חשבונית מס");
+    EXPECT_EQ(stopped["controls"]["cmbRules"], -1);
+    if (saved.empty())
+        unsetenv("XDG_CONFIG_HOME");
+    else
+        setenv("XDG_CONFIG_HOME", saved.c_str(), 1);
 }
 
 TEST(CliTest, FailuresAndUsageErrorsExitWithTheirCodes) {

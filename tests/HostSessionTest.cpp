@@ -176,5 +176,75 @@ TEST_F(HostSessionTest, NumbersThatAreNotFiniteAreWrittenAsNull) {
     EXPECT_TRUE(state["PubSearchValue"].is_null());
 }
 
+TEST_F(HostSessionTest, TwoControlsOnOneThreadShareTheCompanyNotThePosition) {
+    TestCompany company(kCompany);
+    std::string path = company.path().string();
+    json made = ask({"new", {{"SettingID", " 5 "}, {"AccountKey", "1001"}}});
+    EXPECT_EQ(made["state"]["AppName"], "Dovrel5");
+    EXPECT_EQ(made["state"]["controls"]["txtAccountKey"], "1001");
+    EXPECT_EQ(ask({"call", "ShowDoc", path, 20, 2})["result"], 0);
+    EXPECT_EQ(ask({"use", 2})["error"], "There is no control 2; make it with new2");
+    json second = ask({"new2"});
+    EXPECT_EQ(second["state"]["PubACTLocation"], 2);
+    EXPECT_EQ(second["state"]["CompDir"], "c:\\comp02"); // its start-up loaded the settings
+    ask({"call", "SetCompDir", path});
+    ask({"set", "cmbDocType", 13});
+    EXPECT_EQ(ask({"click", "LastButt"})["state"]["controls"]["txtCustomerName"], "משה כהן");
+    json first = ask({"use", 1});
+    EXPECT_EQ(first["state"]["PubACTLocation"], 2);
+    EXPECT_EQ(first["state"]["CompDir"], path);
+    EXPECT_EQ(ask({"call", "SetCompDir"})["result"], path);
+    EXPECT_EQ(ask({"use", 3})["ok"], false);
+}
+
+TEST_F(HostSessionTest, CallsEventsAndTypedTextReachTheControl) {
+    TestCompany company(kCompany);
+    std::string path = company.path().string();
+    ask({"call", "ShowDoc", path, 20, 1});
+    json failed = ask({"call", "ACTLocation", "abc"});
+    EXPECT_EQ(failed["ok"], false);
+    EXPECT_EQ(failed["error"], "Type mismatch");
+    EXPECT_EQ(ask({"call", "ACTLocation"})["result"], 2);
+    EXPECT_EQ(ask({"call", "ACTLocation", 7.5})["state"]["PubACTLocation"], 8);
+    EXPECT_EQ(ask({"call", "RulesValue"})["error"], "RulesValue is not available yet");
+    // Typing a company path resets the position; typing the same one does not.
+    ask({"set", "txtCompPath", path});
+    EXPECT_EQ(ask({"state"})["state"]["PubACTLocation"], 8);
+    EXPECT_EQ(ask({"set", "txtCompPath", path + "/"})["state"]["PubACTLocation"], 2);
+    ask({"set", "CmbDocLang", 1});
+    EXPECT_EQ(ask({"lostfocus", "cmbDocType"})["state"]["controls"]["txtTitle"], "Delivery Note");
+    EXPECT_EQ(ask({"dblclick", "Nothing"})["error"], "Unknown control: Nothing");
+    EXPECT_EQ(ask({"click", "FirstButt"})["state"]["grid"].size(), 4u);
+}
+
+TEST_F(HostSessionTest, QueuedUserActionsRunWhileTheFormIsShown) {
+    ask({"modal", "frmOpenDir", {{"set", "txtTitle", "בחירה"}, {"state"}}});
+    json reply = ask({"click", "CmdDir"});
+    ASSERT_EQ(reply["ok"], true) << reply;
+    EXPECT_EQ(reply["state"]["controls"]["txtTitle"], "בחירה");
+    EXPECT_EQ(reply["state"]["forms"]["frmOpenDir"]["visible"], false);
+    // The queue is used once; a failing action fails the click, form closed.
+    ASSERT_EQ(ask({"modal", "frmOpenDir",
+                   json::array({json::array({"click", "frmOpenDir.Nothing"})})})["ok"],
+              true);
+    json failed = ask({"click", "CmdDir"});
+    EXPECT_EQ(failed["ok"], false);
+    EXPECT_EQ(failed["error"], "Unknown control: frmOpenDir.Nothing");
+    EXPECT_EQ(ask({"state"})["state"]["forms"]["frmOpenDir"]["visible"], false);
+    EXPECT_EQ(ask({"set", "frmAccDetails.x", 1})["error"], "Form frmAccDetails is not loaded");
+    EXPECT_EQ(ask({"modal", "frmOpenDir", "click"})["ok"], false);
+}
+
+TEST_F(HostSessionTest, AnswersAndClipboard) {
+    EXPECT_EQ(ask({"answers", {"yes", "maybe"}})["ok"], false);
+    ask({"answers", {"yes", "no"}});
+    RecordedMessages& box = session.messages();
+    EXPECT_EQ(box.show(MsgIcon::Question, MsgButtons::YesNo, "t", "q"), MsgAnswer::Yes);
+    EXPECT_EQ(box.show(MsgIcon::Question, MsgButtons::YesNo, "t", "q"), MsgAnswer::No);
+    EXPECT_EQ(box.show(MsgIcon::Question, MsgButtons::YesNo, "t", "q"), MsgAnswer::No);
+    session.clipboard().SetText(test::W("טלפון 03"));
+    EXPECT_EQ(ask({"clipboard"})["result"], "טלפון 03");
+}
+
 } // namespace
 } // namespace dovrel
