@@ -232,6 +232,10 @@ TEST_F(HostSessionTest, QueuedUserActionsRunWhileTheFormIsShown) {
     EXPECT_EQ(failed["error"], "Unknown control: frmOpenDir.Nothing");
     EXPECT_EQ(ask({"state"})["state"]["forms"]["frmOpenDir"]["visible"], false);
     EXPECT_EQ(ask({"set", "frmAccDetails.x", 1})["error"], "Form frmAccDetails is not loaded");
+    // The control that shows the form cannot be replaced under it.
+    ask({"modal", "frmOpenDir", json::array({json::array({"new"})})});
+    EXPECT_EQ(ask({"click", "CmdDir"})["error"],
+              "A control cannot be made while one of its forms is shown");
     EXPECT_EQ(ask({"modal", "frmOpenDir", "click"})["ok"], false);
 }
 

@@ -18,13 +18,16 @@ void HostForms::ShowModal(Form& form) {
         found->second.pop_front();
     }
     form.Show();
+    ++depth_;
     try {
         for (const nlohmann::json& request : requests)
             run_(request);
     } catch (...) {
+        --depth_;
         form.Hide();
         throw;
     }
+    --depth_;
     if (form.Visible())
         form.QueryClose();
     form.Hide();

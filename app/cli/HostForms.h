@@ -25,10 +25,13 @@ public:
     // Queues the requests (a JSON array) for the next showing of the form.
     void queue(const std::string& form, nlohmann::json requests);
     void ShowModal(Form& form) override;
+    // True while a form is shown: the control that opened it is still at work.
+    bool showing() const { return depth_ > 0; }
 
 private:
     Runner run_;
     std::map<std::string, std::deque<nlohmann::json>> queued_;
+    int depth_ = 0;
 };
 
 } // namespace dovrel

@@ -48,6 +48,9 @@ HostSession::~HostSession() = default;
 void HostSession::newCard(size_t slot, const json& elements) {
     if (!elements.is_object())
         throw Error("The page elements must be a JSON object");
+    // The control that showed the form is still running its handler.
+    if (forms_.showing())
+        throw Error("A control cannot be made while one of its forms is shown");
     std::map<std::string, std::string> values;
     for (const auto& [id, value] : elements.items())
         values[id] = value.is_string() ? HostArgs::Text(value, id) : value.dump();
