@@ -1,0 +1,409 @@
+// The document reader on a file that another process rewrites, extends and
+// shortens while the reader walks it in every direction.
+//
+// The writer's file is laid out on a fixed grid: record 1 a filler, then
+// documents of five records each (header, continuation, three line slots).
+// Every version of the file it writes is copied, offset for offset, from one
+// of three images made by the sample-company writer; the images differ in
+// references, dates and lines, but the header of the document at slot k has
+// the same account and customer in all of them. So whatever mixture of
+// versions the reader sees, a document it shows must carry the account and
+// customer of its slot, and a reference of that slot.
+//
+// Now and then the reader meets a record while it is being written: half
+// new bytes, half zeros (the writer never writes a zero byte in a text). Such
+// a document may show, with the zeros in its texts, or the reader reports
+// the line number 0 it read; both are counted and must stay rare.
+
+#include "control/Card.h"
+#include "fixfiles/ReadStock.h"
+#include "TestCompany.h"
+
+#include <gtest/gtest.h>
+#include <nlohmann/json.hpp>
+
+#include <fcntl.h>
+#include <signal.h>
+#include <sys/mman.h>
+#include <sys/prctl.h>
+#include <sys/stat.h>
+#include <sys/wait.h>
+#include <time.h>
+#include <unistd.h>
+
+#include <atomic>
+#include <cstring>
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <new>
+#include <set>
+
+namespace dovrel {
+namespace {
+
+using nlohmann::json;
+using test::U;
+using test::W;
+
+constexpr int16_t kDeliveryRow = 13;  // type 20, ISHP.FIX
+constexpr int64_t kRec = kDocRecordLength;
+constexpr int kLineSlots = 3;
+constexpr int64_t kDocRecords = 2 + kLineSlots;
+constexpr int64_t kDocBytes = kDocRecords * kRec;
+constexpr int kDocs = 40;
+constexpr int kVariants = 3;
+const char* const kItemKeys[] = {"A1", "B2", "C3"};
+
+struct Party {
+    const char* account;
+    const char* customer;
+};
+const Party kParties[] = {{"1001", "משה כהן"}, {"2002", "Levi & Sons"},
+                          {"3003", "אור \"הצפון\" בע\"מ"}, {"44", "דנה"}};
+constexpr int kPartyCount = static_cast<int>(std::size(kParties));
+
+int64_t DocOffset(int64_t k) { return kRec + k * kDocBytes; }
+const Party& PartyOf(int64_t k) { return kParties[k % kPartyCount]; }
+std::string ReferenceOf(int variant, int64_t k) {
+    return std::to_string(variant) + "-" + std::to_string(k);
+}
+
+// Variant 0 has three lines per document, variant 1 two, variant 2 one;
+// unused line slots are fillers.
+std::string MakeImage(int variant) {
+    json documents = json::array();
+    for (int k = 0; k < kDocs; ++k) {
+        int lines = kLineSlots - variant;
+        json list = json::array();
+        for (int i = 0; i < lines; ++i)
+            list.push_back({{"key", kItemKeys[(i + variant) % kLineSlots]},
+                            {"description", "שורה " + std::to_string(i)},
+                            {"price", 10 + variant}, {"quantity", 1 + i}});
+        documents.push_back({{"type", 20}, {"account", PartyOf(k).account},
+                             {"customer", PartyOf(k).customer},
+                             {"reference", ReferenceOf(variant, k)},
+                             {"date", "2024-01-0" + std::to_string(variant + 1)},
+                             {"lines", list}});
+        if (lines < kLineSlots)
+            documents.push_back({{"file", "ISHP.FIX"}, {"filler", kLineSlots - lines}});
+    }
+    test::TestCompany company(json{{"documents", documents}}.dump());
+    std::ifstream in(company.file("ISHP.FIX"), std::ios::binary);
+    return {std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>()};
+}
+
+uint64_t NextRandom(uint64_t& state) {
+    state ^= state << 13;
+    state ^= state >> 7;
+    state ^= state << 17;
+    return state;
+}
+
+// Counters in memory shared by the two processes.
+struct Progress {
+    std::atomic<bool> started{false};     // the writer is running
+    std::atomic<uint64_t> operations{0};  // done by the writer
+};
+
+// The writer process: only pwrite and ftruncate on its own descriptor, no
+// allocation. Runs until killed; the alarm and the parent-death signal end it
+// if the test itself dies.
+class Writer {
+public:
+    Writer(int fd, const std::string (&images)[kVariants], int64_t size, Progress& progress)
+        : fd_(fd), images_(images), size_(size), progress_(progress) {}
+
+    [[noreturn]] void run() {
+        prctl(PR_SET_PDEATHSIG, SIGKILL);
+        alarm(120);
+        progress_.started.store(true);
+        uint64_t random = 0x9E3779B97F4A7C15ULL;
+        const timespec pause{0, 20'000};
+        for (;;) {
+            uint64_t r = NextRandom(random);
+            if (!step(r % 8, NextRandom(random)))
+                _exit(3);
+            progress_.operations.fetch_add(1);
+            nanosleep(&pause, nullptr);
+        }
+    }
+
+private:
+    // Documents whose header starts before the end of the file.
+    int64_t docs() const { return size_ <= kRec ? 0 : (size_ - kRec + kDocBytes - 1) / kDocBytes; }
+
+    bool copy(int variant, int64_t offset, int64_t length) {
+        const char* from = images_[variant].data() + offset;
+        if (::pwrite(fd_, from, static_cast<size_t>(length), offset) != length)
+            return false;
+        size_ = std::max(size_, offset + length);
+        return true;
+    }
+    bool shorten(int64_t length) {
+        if (length >= size_)
+            return true;
+        size_ = length;
+        return ::ftruncate(fd_, length) == 0;
+    }
+
+    bool step(uint64_t what, uint64_t r) {
+        int variant = static_cast<int>(r % kVariants);
+        r /= kVariants;
+        int64_t k = docs() == 0 ? 0 : static_cast<int64_t>(r % static_cast<uint64_t>(docs()));
+        switch (what) {
+        case 0:
+        case 1:
+        case 2:  // rewrite one document in place
+            return docs() == 0 || copy(variant, DocOffset(k), kDocBytes);
+        case 3:
+        case 4: {  // complete the last document, or append the next one
+            int64_t next = size_ <= kRec ? 0 : (size_ - kRec) / kDocBytes;
+            if (next >= kDocs)
+                return true;
+            if (size_ < kRec && !copy(variant, 0, kRec))
+                return false;
+            return copy(variant, DocOffset(next), kDocBytes);
+        }
+        case 5:  // cut into the lines of a document, mid-record too
+            return shorten(DocOffset(k) + 2 * kRec + static_cast<int64_t>(r % (kLineSlots * kRec)));
+        case 6:  // cut at a document's start
+            return shorten(DocOffset(k));
+        default:  // cut back to the first record and write the file anew
+            return shorten(kRec) &&
+                   copy(variant, 0, DocOffset(static_cast<int64_t>(r % kDocs) + 1));
+        }
+    }
+
+    int fd_;
+    const std::string (&images_)[kVariants];
+    int64_t size_;
+    Progress& progress_;
+};
+
+// Open descriptors of this process on the file: how many, and how many of
+// them are open for anything but reading.
+struct OpenFds {
+    int count = 0;
+    int writable = 0;
+};
+
+OpenFds FindOpenFds(const std::filesystem::path& file) {
+    OpenFds found;
+    std::error_code ec;
+    for (const auto& entry : std::filesystem::directory_iterator("/proc/self/fd", ec)) {
+        std::error_code linkError;
+        if (std::filesystem::read_symlink(entry.path(), linkError) != file)
+            continue;
+        ++found.count;
+        std::ifstream info("/proc/self/fdinfo/" + entry.path().filename().string());
+        std::string key;
+        std::string value;
+        int flags = -1;
+        while (info >> key >> value)
+            if (key == "flags:")
+                flags = static_cast<int>(std::stol(value, nullptr, 8));
+        if (flags < 0 || (flags & O_ACCMODE) != O_RDONLY)
+            ++found.writable;
+    }
+    return found;
+}
+
+// The writer never writes a zero byte in a text; the reader shows one as U+FFFD.
+bool HalfWritten(const std::string& utf8) {
+    return utf8.find("\xEF\xBF\xBD") != std::string::npos;
+}
+
+struct Search {
+    std::string by;
+    std::string value;  // UTF-8
+    std::string fromDate;
+};
+
+class ConcurrentWriterTest : public ::testing::Test {
+protected:
+    void SetUp() override {
+        for (int v = 0; v < kVariants; ++v) {
+            images[v] = MakeImage(v);
+            ASSERT_EQ(static_cast<int64_t>(images[v].size()), DocOffset(kDocs));
+            for (int64_t k = 0; k < kDocs; ++k)
+                ASSERT_EQ(images[v][static_cast<size_t>(DocOffset(k))], 1) << v << " " << k;
+        }
+        file = dir.path() / "ISHP.FIX";
+        std::ofstream(file, std::ios::binary) << images[0];
+        file = std::filesystem::canonical(file);
+        void* shared = mmap(nullptr, sizeof(Progress), PROT_READ | PROT_WRITE,
+                            MAP_SHARED | MAP_ANONYMOUS, -1, 0);
+        ASSERT_NE(shared, MAP_FAILED);
+        progress = new (shared) Progress;
+    }
+    void TearDown() override {
+        if (child > 0) {
+            kill(child, SIGKILL);
+            waitpid(child, nullptr, 0);
+        }
+        munmap(progress, sizeof(Progress));
+    }
+
+    // Starts the writer on a descriptor opened before the file is made
+    // read-only for everybody, so the reader could not open it for writing.
+    void startWriter() {
+        int fd = ::open(file.c_str(), O_RDWR | O_CLOEXEC);
+        ASSERT_GE(fd, 0);
+        child = fork();
+        ASSERT_GE(child, 0);
+        if (child == 0)
+            Writer(fd, images, static_cast<int64_t>(images[0].size()), *progress).run();
+        ::close(fd);
+        ASSERT_EQ(chmod(file.c_str(), 0444), 0);
+        for (int i = 0; i < 10'000 && !progress->started.load(); ++i)
+            usleep(1000);
+        ASSERT_TRUE(progress->started.load()) << "the writer did not start";
+    }
+
+    ::testing::AssertionResult scan(const std::string& direction, const Search& search);
+    ::testing::AssertionResult checkDocument(const Search& search);
+    ::testing::AssertionResult checkEmpty();
+
+    test::TempDir dir;
+    std::filesystem::path file;
+    std::string images[kVariants];
+    Progress* progress = nullptr;
+    pid_t child = -1;
+
+    ModuleState state;
+    RecordedMessages messages;
+    Card card{messages, state};
+    int found = 0;
+    int empty = 0;
+    int halfWritten = 0;  // scans that met a record half-written
+};
+
+::testing::AssertionResult ConcurrentWriterTest::scan(const std::string& direction,
+                                                       const Search& search) {
+    card.PubSearchBy = search.by;
+    card.PubSearchValue = Variant(W(search.value));
+    card.txtItemKey.setText(W(search.value));
+    card.txtAccountKey.setText("");  // an item search would keep to the account shown
+    card.PubPrevLocation = 0;
+    int16_t row = kDeliveryRow;
+    std::string dirWord = direction;
+    std::string fromDate = search.fromDate;
+    card.ReadStock(FromUtf8(dir.str()), row, card.PubSearchBy, card.PubSearchValue, dirWord,
+                   fromDate);
+    if (!messages.shown().empty()) {
+        std::string text = U(messages.take().back().text);
+        if (!text.starts_with("Line number 0 "))
+            return ::testing::AssertionFailure() << "message: " << text;
+        ++halfWritten;
+        return ::testing::AssertionSuccess();
+    }
+    if (card.ProgressFill.Width() != 0)
+        return ::testing::AssertionFailure() << "the progress bar is left filled";
+    if (card.PubPrevLocation == 0) {
+        ++empty;
+        return checkEmpty();
+    }
+    ++found;
+    return checkDocument(search);
+}
+
+::testing::AssertionResult ConcurrentWriterTest::checkEmpty() {
+    for (const TextBox* box : {&card.txtAccountKey, &card.txtReference1, &card.txtCustomerName,
+                               &card.txtDate, &card.txtTotal1})
+        if (!box->Text().empty())
+            return ::testing::AssertionFailure() << box->name() << " kept " << U(box->Text());
+    if (card.DocLines.Rows() != 2)
+        return ::testing::AssertionFailure() << "empty view has " << card.DocLines.Rows() << " rows";
+    return ::testing::AssertionSuccess();
+}
+
+::testing::AssertionResult ConcurrentWriterTest::checkDocument(const Search& search) {
+    int64_t at = card.PubACTLocation;
+    if (at != card.PubPrevLocation || at < 2 || (at - 2) % kDocRecords != 0)
+        return ::testing::AssertionFailure() << "document shown at record " << at;
+    int64_t k = (at - 2) / kDocRecords;
+    std::set<std::string> references;
+    for (int v = 0; v < kVariants; ++v)
+        references.insert(ReferenceOf(v, k));
+    const std::set<std::string> dates{"01/01/2024", "02/01/2024", "03/01/2024"};
+    std::string account = U(card.txtAccountKey.Text());
+    std::string customer = U(card.txtCustomerName.Text());
+    std::string reference = U(card.txtReference1.Text());
+    std::string date = U(card.txtDate.Text());
+    // Zero bytes in a date make a year of 1900 or before.
+    bool tornDate = date.size() == 10 && date.substr(6) <= "1900";
+    bool torn = false;
+    auto fits = [&](bool written, bool withZeros) {
+        torn = torn || (!written && withZeros);
+        return written || withZeros;
+    };
+    if (!fits(account == PartyOf(k).account, HalfWritten(account)) ||
+        !fits(customer == PartyOf(k).customer, HalfWritten(customer)) ||
+        !fits(references.contains(reference), HalfWritten(reference)) ||
+        !fits(dates.contains(date), tornDate))
+        return ::testing::AssertionFailure() << "record " << at << ": " << account << " / "
+                                             << customer << " / " << reference << " / " << date;
+    if (!search.fromDate.empty() && date == "01/01/2024")
+        return ::testing::AssertionFailure() << "date " << date << " before the from-date";
+    if (card.DocLines.Rows() < 2 || card.DocLines.Rows() > 2 + kLineSlots)
+        return ::testing::AssertionFailure() << card.DocLines.Rows() << " grid rows";
+    for (int32_t line = 1; line + 1 < card.DocLines.Rows(); ++line) {
+        std::string key = U(card.DocLines.TextMatrix(line, 1));
+        if (!fits(key == "A1" || key == "B2" || key == "C3", HalfWritten(key)))
+            return ::testing::AssertionFailure() << "line key " << key;
+    }
+    bool matches = search.by.empty() || (search.by == "AccountKey" && account == search.value) ||
+                   (search.by == "CustomerName" && customer.find(search.value) != std::string::npos) ||
+                   (search.by == "Reference1" && reference == search.value) ||
+                   (search.by == "ItemKey" && card.DocLines.TextMatrix(1, 1) == search.value);
+    if (!matches && !torn)
+        return ::testing::AssertionFailure() << "does not match " << search.by << " " << search.value;
+    halfWritten += torn ? 1 : 0;
+    return ::testing::AssertionSuccess();
+}
+
+TEST_F(ConcurrentWriterTest, ScansEndWithAWholeDocumentOrNothingAndNeverWrite) {
+    OpenFds duringScans;
+    int progressChecks = 0;
+    card.ProgressFill.changed.connect([&] {
+        if (++progressChecks % 4 != 0)
+            return;
+        OpenFds now = FindOpenFds(file);
+        duringScans.count += now.count;
+        duringScans.writable += now.writable;
+    });
+    startWriter();
+
+    const Search searches[] = {{"", "", ""},
+                               {"AccountKey", "2002", ""},
+                               {"CustomerName", "כהן", ""},
+                               {"Reference1", "1-9", ""},
+                               {"ItemKey", "B2", ""},
+                               {"", "", "02/01/2024"},
+                               {"CustomerName", "הצפון", "03/01/2024"}};
+    const char* const walk[] = {"First", "Next", "Next", "Last", "Previous", "Previous", "Next"};
+    uint64_t random = 12345;
+    for (int round = 0; round < 120; ++round) {
+        const Search& search = searches[round % std::size(searches)];
+        for (const char* direction : walk) {
+            ASSERT_TRUE(scan(direction, search)) << direction << " in round " << round;
+            OpenFds after = FindOpenFds(file);
+            ASSERT_EQ(after.count, 0) << "the file stays open after a scan";
+        }
+        // Now and then start from anywhere, past the end of the file too.
+        card.PubACTLocation = static_cast<int32_t>(NextRandom(random) % (kDocs * kDocRecords + 40));
+    }
+
+    EXPECT_GT(found, 0);
+    EXPECT_GT(empty, 0);
+    EXPECT_LE(halfWritten * 100, found + empty) << "half-written records are rare";
+    EXPECT_GT(duringScans.count, 0) << "the file was never seen open during a scan";
+    EXPECT_EQ(duringScans.writable, 0) << "the reader opened the file for writing";
+    EXPECT_GT(progress->operations.load(), 100u) << "the writer hardly ran";
+    int status = 0;
+    EXPECT_EQ(waitpid(child, &status, WNOHANG), 0) << "the writer stopped early";
+}
+
+} // namespace
+} // namespace dovrel
