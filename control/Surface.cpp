@@ -16,66 +16,6 @@ constexpr uint32_t kSearchLabelColor = 0x000080;
 
 using Kind = ControlKind;
 
-ControlDesign Field(const char* name, Kind kind, int32_t left, int32_t top, int32_t width,
-                    bool grey = false) {
-    ControlDesign d;
-    d.name = name;
-    d.kind = kind;
-    d.left = left;
-    d.top = top;
-    d.width = width;
-    d.height = kind == Kind::ComboBox ? kListHeight : kTextHeight;
-    d.grey = grey;
-    return d;
-}
-
-// A caption label stands to the right of the field it names (the layout runs
-// right to left), its width taken from the caption's length.
-ControlDesign CaptionLabel(const char* name, const char* captionUtf8, const ControlDesign& field,
-                           bool searches = false) {
-    ControlDesign d;
-    d.name = name;
-    d.kind = Kind::Label;
-    d.caption = FromUtf8(captionUtf8);
-    d.labelFor = field.name;
-    d.left = field.left + field.width + 60;
-    d.top = field.top + 30;
-    d.width = static_cast<int32_t>(d.caption.size()) * 100 + 100;
-    d.height = kLabelHeight;
-    d.bold = searches;
-    d.foreColor = searches ? kSearchLabelColor : 0;
-    return d;
-}
-
-ControlDesign Command(const char* name, const char* captionUtf8, const char* tipUtf8,
-                      const char* picture, int32_t left, int32_t top, int32_t width,
-                      int32_t height) {
-    ControlDesign d;
-    d.name = name;
-    d.kind = Kind::Button;
-    d.caption = FromUtf8(captionUtf8);
-    d.toolTip = FromUtf8(tipUtf8);
-    d.picture = picture;
-    d.left = left;
-    d.top = top;
-    d.width = width;
-    d.height = height;
-    return d;
-}
-
-ControlDesign Check(const char* name, const char* captionUtf8, int32_t left, int32_t top,
-                    int32_t width) {
-    ControlDesign d;
-    d.name = name;
-    d.kind = Kind::CheckBox;
-    d.caption = FromUtf8(captionUtf8);
-    d.left = left;
-    d.top = top;
-    d.width = width;
-    d.height = kCheckHeight;
-    return d;
-}
-
 ControlDesign Plain(const char* name, Kind kind, const char* captionUtf8, int32_t left, int32_t top,
                     int32_t width, int32_t height) {
     ControlDesign d;
@@ -87,6 +27,41 @@ ControlDesign Plain(const char* name, Kind kind, const char* captionUtf8, int32_
     d.width = width;
     d.height = height;
     return d;
+}
+
+ControlDesign Field(const char* name, Kind kind, int32_t left, int32_t top, int32_t width,
+                    bool grey = false) {
+    ControlDesign d =
+        Plain(name, kind, "", left, top, width, kind == Kind::ComboBox ? kListHeight : kTextHeight);
+    d.grey = grey;
+    return d;
+}
+
+// A caption label stands to the right of the field it names (the layout runs
+// right to left), its width taken from the caption's length.
+ControlDesign CaptionLabel(const char* name, const char* captionUtf8, const ControlDesign& field,
+                           bool searches = false) {
+    ControlDesign d = Plain(name, Kind::Label, captionUtf8, field.left + field.width + 60,
+                            field.top + 30, 0, kLabelHeight);
+    d.width = static_cast<int32_t>(d.caption.size()) * 100 + 100;
+    d.labelFor = field.name;
+    d.bold = searches;
+    d.foreColor = searches ? kSearchLabelColor : 0;
+    return d;
+}
+
+ControlDesign Command(const char* name, const char* captionUtf8, const char* tipUtf8,
+                      const char* picture, int32_t left, int32_t top, int32_t width,
+                      int32_t height) {
+    ControlDesign d = Plain(name, Kind::Button, captionUtf8, left, top, width, height);
+    d.toolTip = FromUtf8(tipUtf8);
+    d.picture = picture;
+    return d;
+}
+
+ControlDesign Check(const char* name, const char* captionUtf8, int32_t left, int32_t top,
+                    int32_t width) {
+    return Plain(name, Kind::CheckBox, captionUtf8, left, top, width, kCheckHeight);
 }
 
 std::vector<std::string> Entries(std::initializer_list<const char*> utf8) {
