@@ -7,10 +7,12 @@
 #include <gtest/gtest.h>
 #include <sqlite3.h>
 
+#include <sys/resource.h>
 #include <sys/stat.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include <csignal>
 #include <cstdlib>
 #include <fstream>
 #include <functional>
@@ -93,11 +95,11 @@ std::optional<std::string> FailureOf(const std::function<void()>& work) {
     }
 }
 
-// The same, where file modes matter: when the tests run as root, which they do not stop, the
-// work runs in a child process as "nobody".
-std::optional<std::string> FailureAsUser(const std::function<void()>& work) {
-    if (geteuid() != 0)
-        return FailureOf(work);
+// The failure of work run in a child process after prepare (which returns
+// false when the child cannot be set up), so that what the child changes about
+// itself (its user, its file size limit) ends with it.
+std::optional<std::string> FailureInChild(const std::function<bool()>& prepare,
+                                          const std::function<void()>& work) {
     int fds[2];
     if (pipe(fds) != 0)
         return "pipe failed";
@@ -105,8 +107,8 @@ std::optional<std::string> FailureAsUser(const std::function<void()>& work) {
     if (child == 0) {
         close(fds[0]);
         std::string answer = "-";
-        if (setgid(65534) != 0 || setuid(65534) != 0)
-            answer = "!cannot become nobody";
+        if (!prepare())
+            answer = "!cannot prepare the child";
         else
             try {
                 work();
@@ -126,6 +128,14 @@ std::optional<std::string> FailureAsUser(const std::function<void()>& work) {
     if (answer.empty() || answer[0] == '!')
         return "child failed: " + answer;
     return answer[0] == 'E' ? std::optional(answer.substr(1)) : std::nullopt;
+}
+
+// The same, where file modes matter: when the tests run as root, which they do not stop, the
+// work runs in a child process as "nobody".
+std::optional<std::string> FailureAsUser(const std::function<void()>& work) {
+    if (geteuid() != 0)
+        return FailureOf(work);
+    return FailureInChild([] { return setgid(65534) == 0 && setuid(65534) == 0; }, work);
 }
 
 mode_t ModeOf(const std::filesystem::path& path) {
@@ -241,6 +251,24 @@ TEST_F(SqliteStoreTest, AReadOnlyDirectoryFailsTheSaveAndLosesNothing) {
               std::nullopt);
     chmod(file.parent_path().c_str(), 0700);
     EXPECT_EQ(store.GetSetting("Dovrel", "Params", "CompPath", ""), "kept");
+}
+
+// A full disk: in a child whose files may not grow past their present size, a
+// save that needs more room fails plainly, and every stored value stays.
+TEST_F(SqliteStoreTest, AFullDiskFailsTheSaveAndLosesNothing) {
+    store.SaveSetting("Dovrel", "Params", "CompPath", "kept");
+    auto size = static_cast<rlim_t>(std::filesystem::file_size(file));
+    std::optional<std::string> failure = FailureInChild(
+        [size] {
+            rlimit limit{size, size};
+            return signal(SIGXFSZ, SIG_IGN) != SIG_ERR && setrlimit(RLIMIT_FSIZE, &limit) == 0;
+        },
+        [this] { store.SaveSetting("Dovrel", "Params", "Big", std::string(1 << 20, 'x')); });
+    EXPECT_THAT(failure.value_or(""), HasSubstr("Cannot save setting \"Big\" to " + file.string()));
+    EXPECT_EQ(store.GetSetting("Dovrel", "Params", "CompPath", ""), "kept");
+    EXPECT_FALSE(store.FindSetting("Dovrel", "Params", "Big"));
+    store.SaveSetting("Dovrel", "Params", "CompPath", "after");
+    EXPECT_EQ(store.GetSetting("Dovrel", "Params", "CompPath", ""), "after");
 }
 
 // Another connection that holds a write transaction on the file.
