@@ -270,6 +270,17 @@ StoredNumber DoubleBytes(double value) {
     return n;
 }
 
+// A percentage as an int16 in hundredths (12.5 is 1250); nothing when it
+// does not fit.
+std::optional<StoredNumber> HundredthsBytes(double percent) {
+    double hundredths = std::round(percent * 100);
+    if (!(hundredths >= INT16_MIN && hundredths <= INT16_MAX))
+        return std::nullopt;
+    auto stored = static_cast<uint16_t>(static_cast<int16_t>(hundredths));
+    return StoredNumber{
+        std::string{static_cast<char>(stored & 0xFF), static_cast<char>(stored >> 8)}, percent};
+}
+
 StoredNumber HexNumber(const json& value, const Where& where, size_t width) {
     CheckObject(value, where, {"hex"});
     if (!value.contains("hex"))
@@ -305,16 +316,11 @@ StoredNumber HundredthsField(const json& object, std::string_view key, const Whe
         return HexNumber(*value, where[key], 2);
     if (!value->is_number())
         where[key].Fail("expected a number");
-    double percent = value->get<double>();
-    double hundredths = std::round(percent * 100);
-    if (!(hundredths >= INT16_MIN && hundredths <= INT16_MAX))
+    std::optional<StoredNumber> stored = HundredthsBytes(value->get<double>());
+    if (!stored)
         where[key].Fail("expected a number from -327.68 to 327.67");
-    auto stored = static_cast<uint16_t>(static_cast<int16_t>(hundredths));
-    std::string bytes{static_cast<char>(stored & 0xFF), static_cast<char>(stored >> 8)};
-    return {bytes, percent};
+    return *stored;
 }
-
-enum class Order { Visual, AsGiven };
 
 std::string Padded(std::string bytes, size_t width) {
     bytes.resize(width, ' ');
@@ -456,35 +462,59 @@ bool ShownLine(const std::string& record, int docType) {
     return key != "#" && static_cast<unsigned char>(record[93]) == docType;
 }
 
+// The stored form of each field of a line record; the description writer
+// and the record-level entry point both fill it.
+struct LineFields {
+    int kind = 3;
+    std::string key, description, details; // stored bytes, cut or padded to width
+    int currency = 21;
+    int docType = 0;
+    StoredNumber price, total, quantity, discount;
+    int lineNumber = 1;
+};
+
+std::string EncodeLine(const LineFields& f) {
+    std::string record(kDocRecord, ' ');
+    PutByte(record, 0, f.kind);
+    Put(record, 1, Padded(f.key, 12));
+    Put(record, 13, Padded(f.description, 40));
+    Zero(record, 53, 2);
+    Put(record, 64, Padded(f.details, 8));
+    PutByte(record, 72, f.currency);
+    PutByte(record, 93, f.docType);
+    Zero(record, 94, 14);
+    Put(record, 108, f.price.bytes);
+    Put(record, 116, f.total.bytes);
+    Put(record, 124, f.quantity.bytes);
+    Zero(record, 132, 24);
+    Put(record, 156, f.discount.bytes);
+    Zero(record, 158, 4);
+    PutByte(record, 162, f.lineNumber);
+    return record;
+}
+
 Line LineRecord(const json& line, const Where& where, int docType, size_t position) {
     CheckObject(line, where,
                 {"kind", "key", "description", "details", "currency", "docType", "price", "rate",
                  "total", "quantity", "discount", "lineNumber"});
     if (!line.contains("lineNumber") && position > 255)
         where.Fail("lines after the 255th need a \"lineNumber\"");
-    std::string record(kDocRecord, ' ');
-    PutByte(record, 0, ByteField(line, "kind", where, 3));
-    Put(record, 1, TextField(line, "key", where, 12));
-    Put(record, 13, TextField(line, "description", where, 40));
-    Zero(record, 53, 2);
-    Put(record, 64, TextField(line, "details", where, 8));
-    PutByte(record, 72, ByteField(line, "currency", where, 21));
-    PutByte(record, 93, ByteField(line, "docType", where, docType));
-    Zero(record, 94, 14);
-    StoredNumber price = DoubleField(line, "price", where, 0);
+    LineFields f;
+    f.kind = ByteField(line, "kind", where, 3);
+    f.key = TextField(line, "key", where, 12);
+    f.description = TextField(line, "description", where, 40);
+    f.details = TextField(line, "details", where, 8);
+    f.currency = ByteField(line, "currency", where, 21);
+    f.docType = ByteField(line, "docType", where, docType);
+    f.price = DoubleField(line, "price", where, 0);
     double rate = PlainNumber(line, "rate", where, 1);
-    StoredNumber quantity = DoubleField(line, "quantity", where, 0);
-    StoredNumber discount = HundredthsField(line, "discount", where);
-    StoredNumber total = DoubleField(
-        line, "total", where, price.value * rate * quantity.value * (100 - discount.value) / 100);
-    Put(record, 108, price.bytes);
-    Put(record, 116, total.bytes);
-    Put(record, 124, quantity.bytes);
-    Zero(record, 132, 24);
-    Put(record, 156, discount.bytes);
-    Zero(record, 158, 4);
-    PutByte(record, 162, ByteField(line, "lineNumber", where, static_cast<int>(position)));
-    return {record, total.value, ShownLine(record, docType)};
+    f.quantity = DoubleField(line, "quantity", where, 0);
+    f.discount = HundredthsField(line, "discount", where);
+    f.total = DoubleField(line, "total", where,
+                          f.price.value * rate * f.quantity.value * (100 - f.discount.value) / 100);
+    f.lineNumber = ByteField(line, "lineNumber", where, static_cast<int>(position));
+    std::string record = EncodeLine(f);
+    return {record, f.total.value, ShownLine(record, docType)};
 }
 
 std::vector<Line> LineRecords(const json& doc, const Where& where, int docType) {
@@ -555,47 +585,77 @@ std::string DateBytes(const json& doc, const Where& where) {
     return *date;
 }
 
-std::string HeaderRecord(const json& doc, const Where& where, int type, int lineCount,
-                         const std::string& remark) {
+// The stored form of the fields of a header and its continuation record.
+struct DocumentFields {
+    int kind = 1;
+    int type = 20;
+    std::string account, customer, address1, address2, reference; // stored bytes
+    std::vector<std::string> remarks = std::vector<std::string>(3);
+    int lineCount = 0;
+    std::string date; // three bytes: year - 1900, month, day
+    StoredNumber discount, withVat, vat, before;
+    int warehouse = 1;
+};
+
+std::string EncodeHeader(const DocumentFields& f) {
     std::string record(kDocRecord, ' ');
-    PutByte(record, 0, ByteField(doc, "kind", where, 1));
-    PutByte(record, 1, type);
-    Put(record, 2, TextField(doc, "account", where, 8));
-    Put(record, 10, TextField(doc, "customer", where, 30));
-    Put(record, 40, TextField(doc, "address1", where, 30));
-    Put(record, 70, TextField(doc, "address2", where, 30));
-    Put(record, 100, TextField(doc, "reference", where, 5));
-    Put(record, 110, remark);
-    PutByte(record, 158, lineCount);
+    PutByte(record, 0, f.kind);
+    PutByte(record, 1, f.type);
+    Put(record, 2, Padded(f.account, 8));
+    Put(record, 10, Padded(f.customer, 30));
+    Put(record, 40, Padded(f.address1, 30));
+    Put(record, 70, Padded(f.address2, 30));
+    Put(record, 100, Padded(f.reference, 5));
+    Put(record, 110, Padded(f.remarks[0], 48));
+    PutByte(record, 158, f.lineCount);
     return record;
 }
 
-std::string ContinuationRecord(const json& doc, const Where& where,
-                               const std::vector<std::string>& remarks, double linesTotal) {
+std::string EncodeContinuation(const DocumentFields& f) {
     std::string record(kDocRecord, ' ');
     PutByte(record, 0, 2);
     PutByte(record, 1, 0);
-    Put(record, 5, remarks[1]);
-    Put(record, 53, remarks[2]);
+    Put(record, 5, Padded(f.remarks[1], 48));
+    Put(record, 53, Padded(f.remarks[2], 48));
     Zero(record, 101, 1);
-    Put(record, 102, DateBytes(doc, where));
+    Put(record, 102, f.date);
     Zero(record, 105, 7);
-    StoredNumber discount = DoubleField(doc, "discountPercent", where, 0);
-    StoredNumber before = DoubleField(doc, "totalBeforeDiscount", where, linesTotal);
-    StoredNumber vat = DoubleField(doc, "vatPercent", where, 17);
-    StoredNumber withVat =
-        DoubleField(doc, "totalWithVat", where,
-                    before.value * (100 - discount.value) / 100 * (100 + vat.value) / 100);
-    Put(record, 112, discount.bytes);
-    Put(record, 120, withVat.bytes);
-    Put(record, 128, vat.bytes);
+    Put(record, 112, f.discount.bytes);
+    Put(record, 120, f.withVat.bytes);
+    Put(record, 128, f.vat.bytes);
     Zero(record, 136, 2);
-    PutByte(record, 138, ByteField(doc, "warehouse", where, 1));
+    PutByte(record, 138, f.warehouse);
     Zero(record, 139, 1);
     Zero(record, 153, 1);
-    Put(record, 154, before.bytes);
+    Put(record, 154, f.before.bytes);
     Zero(record, 165, 1);
     return record;
+}
+
+double TotalWithVat(double before, double discount, double vat) {
+    return before * (100 - discount) / 100 * (100 + vat) / 100;
+}
+
+DocumentFields DocumentFieldsOf(const json& doc, const Where& where, int type, int lineCount,
+                                double linesTotal) {
+    DocumentFields f;
+    f.remarks = Remarks(doc, where);
+    f.kind = ByteField(doc, "kind", where, 1);
+    f.type = type;
+    f.account = TextField(doc, "account", where, 8);
+    f.customer = TextField(doc, "customer", where, 30);
+    f.address1 = TextField(doc, "address1", where, 30);
+    f.address2 = TextField(doc, "address2", where, 30);
+    f.reference = TextField(doc, "reference", where, 5);
+    f.lineCount = lineCount;
+    f.date = DateBytes(doc, where);
+    f.discount = DoubleField(doc, "discountPercent", where, 0);
+    f.before = DoubleField(doc, "totalBeforeDiscount", where, linesTotal);
+    f.vat = DoubleField(doc, "vatPercent", where, 17);
+    f.withVat = DoubleField(doc, "totalWithVat", where,
+                            TotalWithVat(f.before.value, f.discount.value, f.vat.value));
+    f.warehouse = ByteField(doc, "warehouse", where, 1);
+    return f;
 }
 
 int LineCount(const json& doc, const Where& where, size_t lines) {
@@ -619,13 +679,11 @@ void AppendDocument(const json& doc, const Where& where, Files& files) {
     for (const Line& line : lines)
         if (line.shown)
             linesTotal += line.total;
-    std::vector<std::string> remarks = Remarks(doc, where);
-    std::string header =
-        HeaderRecord(doc, where, type, LineCount(doc, where, lines.size()), remarks[0]);
-    std::string continuation = ContinuationRecord(doc, where, remarks, linesTotal);
+    DocumentFields fields =
+        DocumentFieldsOf(doc, where, type, LineCount(doc, where, lines.size()), linesTotal);
     std::string& bytes = files[name];
-    Append(bytes, header, where);
-    Append(bytes, continuation, where);
+    Append(bytes, EncodeHeader(fields), where);
+    Append(bytes, EncodeContinuation(fields), where);
     for (const Line& line : lines)
         Append(bytes, line.record, where);
 }
@@ -850,6 +908,109 @@ void WriteCompany(const char* descriptionJson, const std::filesystem::path& dir)
     if (descriptionJson == nullptr)
         throw Error("no description was given");
     WriteCompany(std::string_view(descriptionJson), dir);
+}
+
+// ---- Record-level writing ----------------------------------------------------
+
+namespace {
+
+void CheckByte(int value, const std::string& what) {
+    if (value < 0 || value > 255)
+        throw Error(what + ": expected a whole number from 0 to 255");
+}
+
+LineFields LineFieldsOf(const LineSpec& line, int docType, int lineNumber) {
+    CheckByte(line.currency, "line currency");
+    LineFields f;
+    f.key = line.key;
+    f.description = line.description;
+    f.details = line.details;
+    f.currency = line.currency;
+    f.docType = docType;
+    f.price = DoubleBytes(line.price);
+    f.quantity = DoubleBytes(line.quantity);
+    std::optional<StoredNumber> discount = HundredthsBytes(line.discount);
+    if (!discount)
+        throw Error("line discount " + std::to_string(line.discount) +
+                    " is outside -327.68 to 327.67");
+    f.discount = *discount;
+    f.total = DoubleBytes(line.price * line.quantity * (100 - line.discount) / 100);
+    f.lineNumber = lineNumber;
+    return f;
+}
+
+std::string DateBytesOf(const DocumentSpec& doc) {
+    std::chrono::year_month_day date{std::chrono::year(doc.year),
+                                     std::chrono::month(static_cast<unsigned>(doc.month)),
+                                     std::chrono::day(static_cast<unsigned>(doc.day))};
+    if (!date.ok() || doc.year < 1900 || doc.year > 2155 || doc.month < 1 || doc.day < 1)
+        throw Error("document date " + std::to_string(doc.year) + "-" +
+                    std::to_string(doc.month) + "-" + std::to_string(doc.day) +
+                    " does not exist or is outside 1900 to 2155");
+    return {static_cast<char>(doc.year - 1900), static_cast<char>(doc.month),
+            static_cast<char>(doc.day)};
+}
+
+DocumentFields FieldsOf(const DocumentSpec& doc, double linesTotal) {
+    CheckByte(doc.type, "document type");
+    CheckByte(doc.warehouse, "warehouse");
+    DocumentFields f;
+    f.type = doc.type;
+    f.account = doc.account;
+    f.customer = doc.customer;
+    f.address1 = doc.address1;
+    f.address2 = doc.address2;
+    f.reference = doc.reference;
+    f.remarks.assign(doc.remarks.begin(), doc.remarks.end());
+    f.lineCount = static_cast<int>(doc.lines.size());
+    f.date = DateBytesOf(doc);
+    f.discount = DoubleBytes(doc.discountPercent);
+    f.before = DoubleBytes(linesTotal);
+    f.vat = DoubleBytes(doc.vatPercent);
+    f.withVat = DoubleBytes(TotalWithVat(linesTotal, doc.discountPercent, doc.vatPercent));
+    f.warehouse = doc.warehouse;
+    return f;
+}
+
+} // namespace
+
+std::string StoredText(std::string_view utf8, size_t width, Order order) {
+    return ReadingOrderText(std::string(utf8), width, order);
+}
+
+std::string DocumentFileOf(int type) {
+    return FileOfType(type);
+}
+
+void AppendDocumentRecords(const DocumentSpec& doc, std::string& out) {
+    if (doc.lines.size() > 255)
+        throw Error("a document holds at most 255 line records");
+    std::vector<std::string> lines;
+    lines.reserve(doc.lines.size());
+    double linesTotal = 0;
+    for (size_t i = 0; i < doc.lines.size(); ++i) {
+        LineFields line = LineFieldsOf(doc.lines[i], doc.type, static_cast<int>(i + 1));
+        lines.push_back(EncodeLine(line));
+        if (ShownLine(lines.back(), doc.type))
+            linesTotal += line.total.value;
+    }
+    DocumentFields fields = FieldsOf(doc, linesTotal);
+    out += EncodeHeader(fields);
+    out += EncodeContinuation(fields);
+    for (const std::string& line : lines)
+        out += line;
+}
+
+std::string ItemRecordOf(const nlohmann::json& item) {
+    return ItemRecord(item, Where()["item"]);
+}
+
+std::string AccountRecordOf(const nlohmann::json& account) {
+    return AccountRecord(account, Where()["account"]);
+}
+
+std::string FillerRecordOf(size_t recordLength, bool documentFile) {
+    return documentFile ? FillerRecord(recordLength) : std::string(recordLength, ' ');
 }
 
 } // namespace dovrel::sample

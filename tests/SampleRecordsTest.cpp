@@ -1,0 +1,112 @@
+// The sample writer's record-level entry points give the same bytes as a
+// description of the same company.
+
+#include "tools/SampleWriter.h"
+
+#include "TestCompany.h"
+#include "platform/Error.h"
+
+#include <gtest/gtest.h>
+#include <nlohmann/json.hpp>
+
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <string>
+
+namespace dovrel {
+namespace {
+
+using nlohmann::json;
+using sample::StoredText;
+
+std::string ReadAll(const std::filesystem::path& path) {
+    std::ifstream in(path, std::ios::binary);
+    return {std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>()};
+}
+
+// The file as the description writer makes it, without its first record.
+std::string Described(const json& description, const std::string& file, size_t recordLength) {
+    test::TempDir dir;
+    sample::WriteCompany(description, dir.path());
+    return ReadAll(dir.path() / file).substr(recordLength);
+}
+
+TEST(SampleRecordsTest, DocumentRecordsMatchTheDescriptionWriter) {
+    json doc = {{"type", 5}, {"account", "1001"}, {"customer", "משה כהן (בע\"מ)"},
+                {"address1", "רח' הרצל 45"}, {"address2", "תל אביב"}, {"reference", "4711"},
+                {"remarks", {"הערה ראשונה", "", "Remark 3"}}, {"date", "2019-02-28"},
+                {"discountPercent", 7.5}, {"vatPercent", 18}, {"warehouse", 3},
+                {"lines",
+                 {{{"key", "A100"}, {"description", "מברג חשמלי"}, {"details", "X1"},
+                   {"price", 1234.5}, {"quantity", 2}, {"discount", 12.5}},
+                  {{"key", "*"}, {"description", "שורת טקסט"}},
+                  {{"key", "#"}, {"description", "נסתרת"}, {"price", 99}, {"quantity", 1}},
+                  {{"key", "B-200"}, {"currency", 1}, {"price", 0.1}, {"quantity", 0.5}}}}};
+    sample::DocumentSpec spec;
+    spec.type = 5;
+    spec.account = StoredText("1001", 8);
+    spec.customer = StoredText("משה כהן (בע\"מ)", 30);
+    spec.address1 = StoredText("רח' הרצל 45", 30);
+    spec.address2 = StoredText("תל אביב", 30);
+    spec.reference = StoredText("4711", 5);
+    spec.remarks = {StoredText("הערה ראשונה", 48), "", StoredText("Remark 3", 48)};
+    spec.year = 2019, spec.month = 2, spec.day = 28;
+    spec.discountPercent = 7.5;
+    spec.vatPercent = 18;
+    spec.warehouse = 3;
+    spec.lines = {{StoredText("A100", 12), StoredText("מברג חשמלי", 40), "X1", 21, 1234.5, 2,
+                   12.5},
+                  {"*", StoredText("שורת טקסט", 40), "", 21, 0, 0, 0},
+                  {"#", StoredText("נסתרת", 40), "", 21, 99, 1, 0},
+                  {"B-200", "", "", 1, 0.1, 0.5, 0}};
+    std::string records;
+    sample::AppendDocumentRecords(spec, records);
+    EXPECT_EQ(records, Described({{"documents", {doc}}}, "IMV.FIX", 170));
+    EXPECT_EQ(records.size(), 6u * 170);
+}
+
+TEST(SampleRecordsTest, ItemAccountAndFillerRecordsMatchTheDescriptionWriter) {
+    json item = {{"key", "מק-7"}, {"name", "מקלדת"}, {"category", "07"},
+                 {"foreignName", "Keyboard"}};
+    json account = {{"key", "1001"}, {"name", "דוד לוי"}, {"phone", "03-1234567"},
+                    {"district", "מרכז"}, {"details", "לקוח ותיק"}};
+    std::string items = Described({{"items", {item}}}, "ITM.fix", 500);
+    std::string accounts = Described({{"accounts", {account}}}, "ACT.fix", 650);
+    EXPECT_EQ(items, sample::ItemRecordOf(item) + sample::FillerRecordOf(500, false));
+    EXPECT_EQ(accounts, sample::AccountRecordOf(account) + sample::FillerRecordOf(650, false));
+
+    test::TempDir dir;
+    sample::WriteCompany(json{{"documents", json::array()}}, dir.path());
+    EXPECT_EQ(ReadAll(dir.path() / "ISHP.FIX"), sample::FillerRecordOf(170, true));
+}
+
+TEST(SampleRecordsTest, FilesByTypeAndBadValues) {
+    EXPECT_EQ(sample::DocumentFileOf(20), "ISHP.FIX");
+    EXPECT_EQ(sample::DocumentFileOf(36), "IORDR.FIX");
+    EXPECT_EQ(sample::DocumentFileOf(41), "IBD.FIX");
+    EXPECT_EQ(sample::DocumentFileOf(19), "IMV.FIX");
+
+    std::string out;
+    auto fails = [&out](sample::DocumentSpec spec) {
+        out.clear();
+        EXPECT_THROW(sample::AppendDocumentRecords(spec, out), Error);
+        EXPECT_TRUE(out.empty());
+    };
+    sample::DocumentSpec bad;
+    bad.month = 2, bad.day = 30;
+    fails(bad);
+    bad = {};
+    bad.type = 256;
+    fails(bad);
+    bad = {};
+    bad.lines = {{"A1", "", "", 21, 1, 1, 400}};
+    fails(bad);
+    bad = {};
+    bad.lines.resize(256);
+    fails(bad);
+    EXPECT_THROW(sample::ItemRecordOf({{"key", "A1"}, {"price", 3}}), Error);
+}
+
+} // namespace
+} // namespace dovrel
