@@ -33,13 +33,24 @@ std::string Described(const json& description, const std::string& file, size_t r
 }
 
 TEST(SampleRecordsTest, DocumentRecordsMatchTheDescriptionWriter) {
-    json doc = {{"type", 5}, {"account", "1001"}, {"customer", "משה כהן (בע\"מ)"},
-                {"address1", "רח' הרצל 45"}, {"address2", "תל אביב"}, {"reference", "4711"},
-                {"remarks", {"הערה ראשונה", "", "Remark 3"}}, {"date", "2019-02-28"},
-                {"discountPercent", 7.5}, {"vatPercent", 18}, {"warehouse", 3},
+    json doc = {{"type", 5},
+                {"account", "1001"},
+                {"customer", "משה כהן (בע\"מ)"},
+                {"address1", "רח' הרצל 45"},
+                {"address2", "תל אביב"},
+                {"reference", "4711"},
+                {"remarks", {"הערה ראשונה", "", "Remark 3"}},
+                {"date", "2019-02-28"},
+                {"discountPercent", 7.5},
+                {"vatPercent", 18},
+                {"warehouse", 3},
                 {"lines",
-                 {{{"key", "A100"}, {"description", "מברג חשמלי"}, {"details", "X1"},
-                   {"price", 1234.5}, {"quantity", 2}, {"discount", 12.5}},
+                 {{{"key", "A100"},
+                   {"description", "מברג חשמלי"},
+                   {"details", "X1"},
+                   {"price", 1234.5},
+                   {"quantity", 2},
+                   {"discount", 12.5}},
                   {{"key", "*"}, {"description", "שורת טקסט"}},
                   {{"key", "#"}, {"description", "נסתרת"}, {"price", 99}, {"quantity", 1}},
                   {{"key", "B-200"}, {"currency", 1}, {"price", 0.1}, {"quantity", 0.5}}}}};
@@ -55,8 +66,7 @@ TEST(SampleRecordsTest, DocumentRecordsMatchTheDescriptionWriter) {
     spec.discountPercent = 7.5;
     spec.vatPercent = 18;
     spec.warehouse = 3;
-    spec.lines = {{StoredText("A100", 12), StoredText("מברג חשמלי", 40), "X1", 21, 1234.5, 2,
-                   12.5},
+    spec.lines = {{StoredText("A100", 12), StoredText("מברג חשמלי", 40), "X1", 21, 1234.5, 2, 12.5},
                   {"*", StoredText("שורת טקסט", 40), "", 21, 0, 0, 0},
                   {"#", StoredText("נסתרת", 40), "", 21, 99, 1, 0},
                   {"B-200", "", "", 1, 0.1, 0.5, 0}};
@@ -67,10 +77,13 @@ TEST(SampleRecordsTest, DocumentRecordsMatchTheDescriptionWriter) {
 }
 
 TEST(SampleRecordsTest, ItemAccountAndFillerRecordsMatchTheDescriptionWriter) {
-    json item = {{"key", "מק-7"}, {"name", "מקלדת"}, {"category", "07"},
-                 {"foreignName", "Keyboard"}};
-    json account = {{"key", "1001"}, {"name", "דוד לוי"}, {"phone", "03-1234567"},
-                    {"district", "מרכז"}, {"details", "לקוח ותיק"}};
+    json item = {
+        {"key", "מק-7"}, {"name", "מקלדת"}, {"category", "07"}, {"foreignName", "Keyboard"}};
+    json account = {{"key", "1001"},
+                    {"name", "דוד לוי"},
+                    {"phone", "03-1234567"},
+                    {"district", "מרכז"},
+                    {"details", "לקוח ותיק"}};
     std::string items = Described({{"items", {item}}}, "ITM.fix", 500);
     std::string accounts = Described({{"accounts", {account}}}, "ACT.fix", 650);
     EXPECT_EQ(items, sample::ItemRecordOf(item) + sample::FillerRecordOf(500, false));

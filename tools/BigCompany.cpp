@@ -27,19 +27,19 @@ constexpr int kYears = 10;
 constexpr int kFirstYear = 2015;
 
 // The shares of the documents in the invoices and stock movements file.
-const std::vector<TypeWeight> kDefaultMix = {{1, 40}, {2, 15}, {3, 5}, {4, 3}, {5, 8},
+const std::vector<TypeWeight> kDefaultMix = {{1, 40}, {2, 15}, {3, 5}, {4, 3},  {5, 8},
                                              {6, 3},  {7, 10}, {9, 2}, {10, 2}, {12, 4},
                                              {14, 1}, {15, 2}, {19, 1}};
 
-const char* const kFirstNames[] = {"משה", "דוד", "יוסי", "רחל", "שרה", "אבי", "נועה", "מיכל",
-                                   "יעקב", "אורית", "רונית", "איתן", "עמית", "תמר", "גיל", "ליאת"};
-const char* const kLastNames[] = {"כהן", "לוי", "מזרחי", "פרץ", "ביטון", "דהן", "אברהם",
-                                  "פרידמן", "אזולאי", "גבאי", "שפירא", "קליין", "רוזן", "חדד"};
+const char* const kFirstNames[] = {"משה",  "דוד",   "יוסי",  "רחל",  "שרה",  "אבי", "נועה", "מיכל",
+                                   "יעקב", "אורית", "רונית", "איתן", "עמית", "תמר", "גיל",  "ליאת"};
+const char* const kLastNames[] = {"כהן",    "לוי",    "מזרחי", "פרץ",   "ביטון", "דהן",  "אברהם",
+                                  "פרידמן", "אזולאי", "גבאי",  "שפירא", "קליין", "רוזן", "חדד"};
 const char* const kFirms[] = {"בע\"מ", "ושות'", "מחשבים", "יבוא ושיווק", "שיווק", "טכנולוגיות"};
-const char* const kStreets[] = {"הרצל", "ויצמן", "בן גוריון", "ז'בוטינסקי", "רוטשילד",
-                                "העצמאות", "הנביאים", "אלנבי", "סוקולוב", "ביאליק"};
-const char* const kCities[] = {"תל אביב", "ירושלים", "חיפה", "באר שבע", "נתניה", "חולון",
-                               "פתח תקווה", "ראשון לציון", "אשדוד", "רעננה", "כפר סבא"};
+const char* const kStreets[] = {"הרצל",    "ויצמן",   "בן גוריון", "ז'בוטינסקי", "רוטשילד",
+                                "העצמאות", "הנביאים", "אלנבי",     "סוקולוב",    "ביאליק"};
+const char* const kCities[] = {"תל אביב",   "ירושלים",     "חיפה",  "באר שבע", "נתניה",  "חולון",
+                               "פתח תקווה", "ראשון לציון", "אשדוד", "רעננה",   "כפר סבא"};
 const char* const kDistricts[] = {"מרכז", "צפון", "דרום", "שרון", "שפלה", "ירושלים"};
 const char* const kPrefixes[] = {"KB", "MS", "HD", "CB", "PW", "SC", "A", "B"};
 struct ItemWords {
@@ -47,15 +47,15 @@ struct ItemWords {
     const char* english;
 };
 const ItemWords kItemWords[] = {
-    {"מקלדת", "Keyboard"},   {"עכבר", "Mouse"},         {"דיסק קשיח", "Hard disk"},
+    {"מקלדת", "Keyboard"},        {"עכבר", "Mouse"},           {"דיסק קשיח", "Hard disk"},
     {"כבל רשת", "Network cable"}, {"ספק כוח", "Power supply"}, {"סורק", "Scanner"},
-    {"מסך", "Monitor"},      {"מדפסת", "Printer"},      {"זיכרון", "Memory"},
-    {"מעבד", "Processor"},   {"מתאם", "Adapter"},       {"רמקולים", "Speakers"}};
+    {"מסך", "Monitor"},           {"מדפסת", "Printer"},        {"זיכרון", "Memory"},
+    {"מעבד", "Processor"},        {"מתאם", "Adapter"},         {"רמקולים", "Speakers"}};
 const char* const kDetails[] = {"כחול", "שחור", "לבן", "XL", "L", "SN4821", "V2", "אפור"};
 const char* const kRemarks[] = {"אספקה עד סוף החודש", "לפי הזמנה טלפונית", "תשלום שוטף + 30",
-                                "המחיר כולל התקנה", "משלוח לסניף", "אחריות לשנה"};
-const char* const kTextLines[] = {"הערה: הסחורה נבדקה", "לפי הצעת מחיר קודמת",
-                                  "ללא החזרה", "המשך בעמוד הבא"};
+                                "המחיר כולל התקנה",   "משלוח לסניף",       "אחריות לשנה"};
+const char* const kTextLines[] = {"הערה: הסחורה נבדקה", "לפי הצעת מחיר קודמת", "ללא החזרה",
+                                  "המשך בעמוד הבא"};
 
 template <typename T, size_t N> constexpr size_t Count(const T (&)[N]) {
     return N;
@@ -101,8 +101,8 @@ std::string AccountName(int64_t index) {
     std::string name = std::string(kFirstNames[i % Count(kFirstNames)]) + " " +
                        kLastNames[(i / Count(kFirstNames)) % Count(kLastNames)];
     if (i % 3 == 0)
-        name = std::string(kLastNames[i % Count(kLastNames)]) + " " +
-               kFirms[(i / 3) % Count(kFirms)];
+        name =
+            std::string(kLastNames[i % Count(kLastNames)]) + " " + kFirms[(i / 3) % Count(kFirms)];
     return name;
 }
 
@@ -142,18 +142,18 @@ std::vector<TypeWeight> ParseTypeMix(std::string_view text) {
         size_t colon = part.find(':');
         int type = 0, weight = 0;
         const char* end = part.data() + part.size();
-        bool ok = colon != std::string_view::npos &&
-                  std::from_chars(part.data(), part.data() + colon, type).ptr ==
-                      part.data() + colon &&
-                  std::from_chars(part.data() + colon + 1, end, weight).ptr == end;
+        bool ok =
+            colon != std::string_view::npos &&
+            std::from_chars(part.data(), part.data() + colon, type).ptr == part.data() + colon &&
+            std::from_chars(part.data() + colon + 1, end, weight).ptr == end;
         if (!ok || weight < 1 || weight > 1000)
             throw Error("type mix entry \"" + std::string(part) +
                         "\": expected TYPE:WEIGHT with a weight from 1 to 1000");
         bool known = std::any_of(types.begin(), types.begin() + kFilledDocTypes,
                                  [&](const DocTypeRow& row) { return row.code == type; });
         if (!known)
-            throw Error("type mix entry \"" + std::string(part) + "\": " +
-                        std::to_string(type) + " is not a document type");
+            throw Error("type mix entry \"" + std::string(part) + "\": " + std::to_string(type) +
+                        " is not a document type");
         mix.emplace_back(type, weight);
     }
     if (mix.empty())
@@ -216,7 +216,6 @@ private:
     std::string buffer_;
     int64_t written_ = 0;
 };
-
 
 const std::string_view kDocumentFiles[] = {"ISHP.FIX", "IORDR.FIX", "IMV.FIX", "IBD.FIX"};
 
@@ -338,9 +337,10 @@ void BigCompany::write(const std::filesystem::path& dir, const Progress& progres
     std::filesystem::create_directories(dir, ec);
     if (ec || !std::filesystem::is_directory(dir))
         throw Error("cannot create the directory " + dir.string());
-    WriteCompany(nlohmann::json{{"company", {{"name", "חברה גדולה"},
-                                             {"title", "חברה גדולה למחשבים בע\"מ"},
-                                             {"currencies", {"יורו"}}}}},
+    WriteCompany(nlohmann::json{{"company",
+                                 {{"name", "חברה גדולה"},
+                                  {"title", "חברה גדולה למחשבים בע\"מ"},
+                                  {"currencies", {"יורו"}}}}},
                  dir);
     writeItems(dir);
     writeAccounts(dir);
@@ -367,12 +367,12 @@ void BigCompany::writeAccounts(const std::filesystem::path& dir) const {
     ChunkedFile out(dir / "ACT.fix");
     out.buffer() += FillerRecordOf(650, false);
     for (int64_t i = 0; i < options_.accounts; ++i) {
-        out.buffer() += AccountRecordOf(
-            {{"key", AccountKey(i)},
-             {"name", AccountName(i)},
-             {"phone", Phone(i)},
-             {"district", kDistricts[static_cast<size_t>(i) % Count(kDistricts)]},
-             {"details", Address1(i) + " " + Address2(i)}});
+        out.buffer() +=
+            AccountRecordOf({{"key", AccountKey(i)},
+                             {"name", AccountName(i)},
+                             {"phone", Phone(i)},
+                             {"district", kDistricts[static_cast<size_t>(i) % Count(kDistricts)]},
+                             {"details", Address1(i) + " " + Address2(i)}});
         out.flushIfFull();
     }
     out.buffer() += FillerRecordOf(650, false);
@@ -395,8 +395,8 @@ void BigCompany::writeDocuments(const std::filesystem::path& dir, const Progress
     std::map<int, int> numbers;
     for (int i; (i = DrawType(mix, fileOfType, options_.docBytes, rng)) >= 0;) {
         DocumentFile& file = *fileOfType[static_cast<size_t>(i)];
-        double fraction = static_cast<double>(file.out->size()) /
-                          static_cast<double>(options_.docBytes);
+        double fraction =
+            static_cast<double>(file.out->size()) / static_cast<double>(options_.docBytes);
         int type = mix[static_cast<size_t>(i)].first;
         AppendDocumentRecords(MakeDocument(*pools_, rng, type, ++numbers[type], fraction),
                               file.out->buffer());

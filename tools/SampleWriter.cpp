@@ -944,9 +944,8 @@ std::string DateBytesOf(const DocumentSpec& doc) {
                                      std::chrono::month(static_cast<unsigned>(doc.month)),
                                      std::chrono::day(static_cast<unsigned>(doc.day))};
     if (!date.ok() || doc.year < 1900 || doc.year > 2155 || doc.month < 1 || doc.day < 1)
-        throw Error("document date " + std::to_string(doc.year) + "-" +
-                    std::to_string(doc.month) + "-" + std::to_string(doc.day) +
-                    " does not exist or is outside 1900 to 2155");
+        throw Error("document date " + std::to_string(doc.year) + "-" + std::to_string(doc.month) +
+                    "-" + std::to_string(doc.day) + " does not exist or is outside 1900 to 2155");
     return {static_cast<char>(doc.year - 1900), static_cast<char>(doc.month),
             static_cast<char>(doc.day)};
 }

@@ -14,8 +14,7 @@ int main(int argc, char** argv) {
     std::string dir;
     std::string mix;
     dovrel::sample::BigCompanyOptions options;
-    app.add_option("DIR", dir, "The company directory to write (created when missing)")
-        ->required();
+    app.add_option("DIR", dir, "The company directory to write (created when missing)")->required();
     app.add_option("--doc-bytes", options.docBytes,
                    "Size of each document file the type mix writes to (at most 1 GiB)")
         ->required();
