@@ -14,6 +14,8 @@ namespace dovrel {
 
 RecordFile::RecordFile(const std::string& path, size_t recordLength, size_t blockSize)
     : path_(path), recordLength_(recordLength),
+      lastNumber_(std::numeric_limits<int64_t>::max() /
+                  std::max<int64_t>(1, static_cast<int64_t>(recordLength))),
       block_(std::max(blockSize, recordLength)) {
     // O_NONBLOCK keeps a named pipe planted where a data file should be from
     // hanging the open; such a file is then refused below.
@@ -41,9 +43,11 @@ RecordFile::~RecordFile() {
 const unsigned char* RecordFile::record(int64_t n) {
     if (n < 1)
         throw Error("Bad record number " + std::to_string(n) + " in " + path_);
-    auto len = static_cast<int64_t>(recordLength_);
-    if (n - 1 > (std::numeric_limits<int64_t>::max() - len) / len)
+    // Worked out once in the constructor: a division for every record would
+    // cost a scan more than the rest of this function.
+    if (n > lastNumber_)
         return nullptr;
+    auto len = static_cast<int64_t>(recordLength_);
     int64_t offset = (n - 1) * len;
     auto inBlock = [&] {
         return offset >= blockStart_ &&

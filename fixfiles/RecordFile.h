@@ -37,6 +37,7 @@ private:
     std::string path_;
     int fd_ = -1;
     size_t recordLength_;
+    int64_t lastNumber_;  // the largest record number whose offset can be computed
     int64_t length_ = 0;
     std::vector<unsigned char> block_;
     int64_t blockStart_ = 0;  // file offset of block_[0]
