@@ -1,6 +1,7 @@
 #include "fixfiles/ReadStock.h"
 
 #include "fixfiles/DateSerial.h"
+#include "fixfiles/FieldPrefilter.h"
 #include "fixfiles/Formats.h"
 #include "fixfiles/ProgressBar.h"
 #include "fixfiles/RecordFields.h"
@@ -54,6 +55,9 @@ struct Walk {
 // One read: the walk over the document file and the loading of the document
 // it finds. Documents and lines are copied out of the file's block before they
 // are decoded further, since the next record read may replace the block.
+// A walk may test millions of records, so a record is decoded only as far as
+// its test needs, and a searched field is decoded only when a FieldPrefilter
+// says it may match.
 class StockScan {
 public:
     StockScan(DocumentView& view, const StockContext& context, const std::string& pSearchBy,
@@ -72,23 +76,28 @@ private:
 
     Walk planWalk(const std::string& direction, int64_t records);
     Candidate tryDocument(RecordFile& file, const unsigned char* headerRec, int64_t at);
-    bool passesHeader(const Record& header, const std::string& accountKey,
-                      const std::string& customer, bool& matched);
+    bool passesHeader(const Record& header, bool& matched);
+    bool lineMatches(const unsigned char* rec);
     void processLine(const unsigned char* rec, uint8_t docType, bool& matched);
+    void startGrid();
     void accept(const Record& header, const Record& cont, const Date& date);
     void nothingFound();
     const std::string& searchText();
+    const FieldPrefilter& filterFor(std::optional<FieldPrefilter>& filter, const std::string& text);
 
     DocumentView& view_;
     const StockContext& ctx_;
     SearchBy searchBy_;
     const Variant& searchValue_;
     std::optional<std::string> searchText_;
+    std::optional<FieldPrefilter> headerFilter_;
+    std::optional<FieldPrefilter> lineFilter_;
     ProgressBar progress_;
     std::optional<Date> fromDate_;
     uint8_t code_ = 0;
     // The document being loaded.
     int accepted_ = 0;
+    bool gridStarted_ = false;
     double factor_ = 1;
     double foreignSum_ = 0;
 };
@@ -97,6 +106,19 @@ const std::string& StockScan::searchText() {
     if (!searchText_)
         searchText_ = searchValue_.toText();
     return *searchText_;
+}
+
+// Made on first use, like the search text, so that a search whose value
+// cannot be read fails only when a document is tested against it.
+const FieldPrefilter& StockScan::filterFor(std::optional<FieldPrefilter>& filter,
+                                           const std::string& text) {
+    if (!filter)
+        filter.emplace(text);
+    return *filter;
+}
+
+std::string AccountKeyOf(const unsigned char* header) {
+    return TrimCopy(LogicalText(Field(header, 2, 8)));
 }
 
 int32_t StockScan::run(const std::string& pCompPath, int16_t pWizFile,
@@ -182,11 +204,9 @@ StockScan::Candidate StockScan::tryDocument(RecordFile& file, const unsigned cha
                                             int64_t at) {
     Record header;
     std::memcpy(header.data(), headerRec, header.size());
-    std::string accountKey = TrimCopy(LogicalText(Field(header.data(), 2, 8)));
-    std::string customer = TrimCopy(LogicalText(Field(header.data(), 10, 30)));
     int lineRecords = header[158];
     bool matched = false;
-    if (!passesHeader(header, accountKey, customer, matched))
+    if (!passesHeader(header, matched))
         return {false, at};
 
     // A header whose continuation record is not in the file yet is a document
@@ -200,7 +220,10 @@ StockScan::Candidate StockScan::tryDocument(RecordFile& file, const unsigned cha
     if (fromDate_ && date < *fromDate_)
         return {false, at + 1};
 
-    view_.InitDocLines();
+    // The grid is reset when the document shows its first line or is
+    // accepted: most documents a search tries are rejected, and resetting
+    // the grid for each would cost more than testing them.
+    gridStarted_ = false;
     factor_ = (100 - DoubleAt(cont.data(), 112)) / 100;
     accepted_ = 0;
     foreignSum_ = 0;
@@ -216,39 +239,63 @@ StockScan::Candidate StockScan::tryDocument(RecordFile& file, const unsigned cha
     return {true, p};
 }
 
-bool StockScan::passesHeader(const Record& header, const std::string& accountKey,
-                             const std::string& customer, bool& matched) {
+bool StockScan::passesHeader(const Record& header, bool& matched) {
+    const unsigned char* h = header.data();
     matched = true;
     switch (searchBy_) {
     case SearchBy::None:
         return true;
     case SearchBy::AccountKey:
-        return EqualsNoCase(accountKey, searchText());
+        return EqualsNoCase(AccountKeyOf(h), searchText());
     case SearchBy::Reference1:
-        return EqualsNoCase(Trim(Field(header.data(), 100, 5)), searchText());
-    case SearchBy::CustomerName:
-        return ContainsNoCase(customer, searchText());
+        return EqualsNoCase(Trim(Field(h, 100, 5)), searchText());
+    case SearchBy::CustomerName: {
+        std::string_view stored = Field(h, 10, 30);
+        return filterFor(headerFilter_, searchText()).mayContain(stored) &&
+               ContainsNoCase(TrimCopy(LogicalText(stored)), searchText());
+    }
     case SearchBy::ItemKey:
     case SearchBy::Details:
         matched = false;
         return view_.txtAccountKey.Text().empty() ||
-               EqualsNoCase(view_.txtAccountKey.Text(), accountKey);
+               EqualsNoCase(view_.txtAccountKey.Text(), AccountKeyOf(h));
     }
     return true;
+}
+
+// Whether the line makes a document of an item-key or details search match.
+bool StockScan::lineMatches(const unsigned char* rec) {
+    if (searchBy_ == SearchBy::ItemKey) {
+        std::string_view stored = Field(rec, 1, 12);
+        const std::string& wanted = view_.txtItemKey.Text();
+        return filterFor(lineFilter_, wanted).mayEqual(stored) &&
+               EqualsNoCase(TrimCopy(LogicalText(stored)), wanted);
+    }
+    if (searchBy_ == SearchBy::Details) {
+        std::string_view stored = Trim(Field(rec, 64, 8));
+        const std::string& wanted = view_.txtDetails.Text();
+        return filterFor(lineFilter_, wanted).mayContain(stored) &&
+               ContainsNoCase(TrimCopy(LogicalText(stored)), wanted);
+    }
+    return false;
+}
+
+void StockScan::startGrid() {
+    if (!gridStarted_)
+        view_.InitDocLines();
+    gridStarted_ = true;
 }
 
 void StockScan::processLine(const unsigned char* rec, uint8_t docType, bool& matched) {
     std::string_view rawKey = Trim(Field(rec, 1, 12));
     if (rawKey == "#" || rec[93] != docType)
         return;
-    std::string itemKey = TrimCopy(LogicalText(Field(rec, 1, 12)));
-    std::string details = TrimCopy(LogicalText(Trim(Field(rec, 64, 8))));
-    if (searchBy_ == SearchBy::ItemKey && EqualsNoCase(itemKey, view_.txtItemKey.Text()))
-        matched = true;
-    if (searchBy_ == SearchBy::Details && ContainsNoCase(details, view_.txtDetails.Text()))
-        matched = true;
+    if (!matched)
+        matched = lineMatches(rec);
     if (!matched)
         return;
+    std::string itemKey = TrimCopy(LogicalText(Field(rec, 1, 12)));
+    std::string details = TrimCopy(LogicalText(Trim(Field(rec, 64, 8))));
 
     if (++accepted_ > kMaxDocLines)
         throw Error("The document has more than " + std::to_string(kMaxDocLines) + " lines");
@@ -283,6 +330,7 @@ void StockScan::processLine(const unsigned char* rec, uint8_t docType, bool& mat
             foreignSum_ = Checked(foreignSum_ + price * quantity * (100 - discount) / 100);
         }
     }
+    startGrid();
     view_.DocLines.AddItem(row, accepted_);
 }
 
@@ -297,6 +345,7 @@ void StockScan::accept(const Record& header, const Record& cont, const Date& dat
     std::string vatValue = FormatAmount(before * factor_ * DoubleAt(c, 128) / 100);
     std::string total1 = FormatAmount(DoubleAt(c, 120));
     double foreignTotal = std::fabs(discount) >= 0.01 ? foreignSum_ * factor_ : foreignSum_;
+    startGrid();
 
     view_.txtAccountKey.setText(TrimCopy(LogicalText(Field(h, 2, 8))));
     view_.txtReference1.setText(TrimCopy(Field(h, 100, 5)));

@@ -1,0 +1,84 @@
+#pragma once
+
+#include <array>
+#include <cstdint>
+#include <string_view>
+
+namespace dovrel {
+
+// Tells from a stored text field, without decoding it, that the field's
+// LogicalText cannot equal or contain a given text (compared without regard
+// to the case of Latin letters), so that a long scan decodes only the few
+// fields that may match. It relies on what LogicalText does: it keeps every
+// Latin letter and digit of the field, turns each DOS Hebrew letter into one
+// code page 1255 letter, keeps or blanks every other character and adds
+// spaces; it never makes a character that is not in the field in some form.
+// So a decoded field can only hold (besides spaces) the field's own
+// characters in their code page 1255 form, and exactly its Latin letters and
+// digits.
+class FieldPrefilter {
+public:
+    // text: the code page 1255 text to be looked for.
+    explicit FieldPrefilter(std::string_view text) : digest_(LatinDigest(text)) {
+        for (char c : text)
+            if (c != ' ')
+                set(needs_, Fold(static_cast<unsigned char>(c)));
+    }
+
+    // False only when LogicalText of the field, trimmed, cannot equal the text.
+    bool mayEqual(std::string_view field) const {
+        return LatinDigest(field) == digest_ && mayContain(field);
+    }
+
+    // False only when LogicalText of the field cannot contain the text.
+    bool mayContain(std::string_view field) const {
+        Mask has{};
+        for (char c : field)
+            set(has, Decoded(static_cast<unsigned char>(c)));
+        for (size_t i = 0; i < needs_.size(); ++i)
+            if ((needs_[i] & ~has[i]) != 0)
+                return false;
+        return true;
+    }
+
+    // A digest of the Latin letters and digits of a text, case folded, that
+    // does not depend on their order; 0 for a text without any.
+    static uint64_t LatinDigest(std::string_view text) {
+        uint64_t digest = 0;
+        for (char c : text) {
+            auto u = static_cast<unsigned char>(c);
+            if ((u >= '0' && u <= '9') || (u >= 'a' && u <= 'z') || (u >= 'A' && u <= 'Z'))
+                digest += Spread(Fold(u));
+        }
+        return digest;
+    }
+
+private:
+    using Mask = std::array<uint64_t, 4>;
+
+    static void set(Mask& mask, unsigned char c) { mask[c >> 6] |= uint64_t{1} << (c & 63); }
+
+    static unsigned char Fold(unsigned char c) {
+        return (c >= 'A' && c <= 'Z') ? static_cast<unsigned char>(c + ('a' - 'A')) : c;
+    }
+
+    // The character a stored byte becomes in the decoded text, case folded.
+    static unsigned char Decoded(unsigned char c) {
+        constexpr unsigned char kDosAlef = 0x80, kDosTav = 0x9A, kToWindows = 0x60;
+        return (c >= kDosAlef && c <= kDosTav) ? static_cast<unsigned char>(c + kToWindows)
+                                               : Fold(c);
+    }
+
+    // Spreads a byte over 64 bits, so that different sets of characters
+    // rarely add up to the same digest.
+    static uint64_t Spread(unsigned char c) {
+        uint64_t x = (c + 1) * 0x9E3779B97F4A7C15ULL;
+        x ^= x >> 31;
+        return x * 0xBF58476D1CE4E5B9ULL;
+    }
+
+    Mask needs_{};
+    uint64_t digest_;
+};
+
+} // namespace dovrel
