@@ -1,5 +1,6 @@
 #include "fixfiles/ItemsFile.h"
 
+#include "fixfiles/FieldPrefilter.h"
 #include "fixfiles/ProgressReset.h"
 #include "fixfiles/RecordFields.h"
 #include "fixfiles/RecordFile.h"
@@ -9,6 +10,7 @@
 #include <algorithm>
 #include <string_view>
 #include <unordered_map>
+#include <vector>
 
 namespace dovrel {
 
@@ -28,13 +30,37 @@ std::string FoldKey(std::string_view key) {
     return folded;
 }
 
-// Each distinct trimmed item key of the document, to the first entry that holds it.
-std::unordered_map<std::string, int> FirstEntryByKey(const CurrentDocument& doc) {
-    std::unordered_map<std::string, int> index;
-    int count = std::clamp<int>(doc.lineCount, 0, kMaxDocLines);
-    for (int entry = 1; entry <= count; ++entry)
-        index.try_emplace(FoldKey(Trim(doc.lines[entry].itemKey)), entry);
-    return index;
+// Each distinct trimmed item key of the document, to the first entry that
+// holds it, and the sorted Latin digests of those keys. An item record whose
+// key field has none of these digests cannot match any line and is passed
+// over without being decoded: most of a large items file is passed over so.
+struct ItemIndex {
+    std::unordered_map<std::string, int> firstEntry;
+    std::vector<uint64_t> digests;
+
+    explicit ItemIndex(const CurrentDocument& doc) {
+        int count = std::clamp<int>(doc.lineCount, 0, kMaxDocLines);
+        for (int entry = 1; entry <= count; ++entry)
+            firstEntry.try_emplace(FoldKey(Trim(doc.lines[entry].itemKey)), entry);
+        for (const auto& entry : firstEntry)
+            digests.push_back(FieldPrefilter::LatinDigest(entry.first));
+        std::sort(digests.begin(), digests.end());
+    }
+};
+
+// Gives the record's category code and foreign name to the first line that
+// has its key, if any.
+void ApplyItem(const unsigned char* record, const ItemIndex& index, CurrentDocument& doc) {
+    std::string_view stored = Field(record, kItemKeyOffset, kItemKeyWidth);
+    if (!std::binary_search(index.digests.begin(), index.digests.end(),
+                            FieldPrefilter::LatinDigest(stored)))
+        return;
+    auto found = index.firstEntry.find(FoldKey(Trim(LogicalText(stored))));
+    if (found == index.firstEntry.end())
+        return;
+    DocumentLine& line = doc.lines[found->second];
+    line.catCode = std::string(Field(record, kCategoryOffset, kCategoryWidth));
+    line.foreignName = TrimCopy(Field(record, kForeignNameOffset, kForeignNameWidth));
 }
 
 } // namespace
@@ -58,18 +84,12 @@ bool ReadITM(const std::string& CompPath, CurrentDocument& doc, ProgressBar prog
     ProgressReset resetter(progress);
     // One lookup per item record. When several records carry the same key,
     // each writes the same entry again, so the last of them in the file stays.
-    std::unordered_map<std::string, int> firstEntry = FirstEntryByKey(doc);
+    ItemIndex index(doc);
     for (int64_t n = 2; n <= last; ++n) {
         const unsigned char* record = file.record(n);
         if (record == nullptr)
             break; // the file has become shorter; what was read still holds
-        std::string key = FoldKey(Trim(LogicalText(Field(record, kItemKeyOffset, kItemKeyWidth))));
-        auto found = firstEntry.find(key);
-        if (found != firstEntry.end()) {
-            DocumentLine& line = doc.lines[found->second];
-            line.catCode = std::string(Field(record, kCategoryOffset, kCategoryWidth));
-            line.foreignName = TrimCopy(Field(record, kForeignNameOffset, kForeignNameWidth));
-        }
+        ApplyItem(record, index, doc);
         if (n % kProgressEvery == 0)
             progress.show(n, last);
     }
