@@ -10,9 +10,11 @@ namespace dovrel {
 // A file of fixed-length records numbered from 1, opened read-only for one
 // operation and closed with the object. Records are read with pread in large
 // blocks, forward or backward, so a scan costs a few system calls per block
-// and its memory does not grow with the file. The file may change while it is
-// read: a record that is no longer (or not yet) wholly in the file is simply
-// not there.
+// and its memory does not grow with the file. The two blocks read last are
+// kept: a backward walk that looks ahead at a document's later records finds
+// them in the block it has just left instead of reading it again. The file
+// may change while it is read: a record that is no longer (or not yet) wholly
+// in the file is simply not there.
 class RecordFile {
 public:
     // Opens the file (a file-system path); an error when it cannot be opened.
@@ -32,17 +34,24 @@ public:
     const unsigned char* record(int64_t n);
 
 private:
+    struct Block {
+        std::vector<unsigned char> bytes;
+        int64_t start = 0; // file offset of bytes[0]
+        size_t filled = 0; // bytes that hold file data
+        bool holds(int64_t offset, int64_t length) const {
+            return offset >= start && offset + length <= start + static_cast<int64_t>(filled);
+        }
+    };
+
     void fill(int64_t offset);
 
     std::string path_;
     int fd_ = -1;
     size_t recordLength_;
-    int64_t lastNumber_;  // the largest record number whose offset can be computed
+    int64_t lastNumber_; // the largest record number whose offset can be computed
     int64_t length_ = 0;
-    std::vector<unsigned char> block_;
-    int64_t blockStart_ = 0;  // file offset of block_[0]
-    size_t blockBytes_ = 0;   // bytes of block_ that hold file data
-    int64_t endSeen_ = -1;    // where the last read met the end of the file; -1 unknown
+    Block blocks_[2];      // the block read last, and the one before it
+    int64_t endSeen_ = -1; // where the last read met the end of the file; -1 unknown
 };
 
 } // namespace dovrel
