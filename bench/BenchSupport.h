@@ -14,6 +14,7 @@
 #include <functional>
 #include <memory>
 #include <string>
+#include <utility>
 
 namespace dovrel::bench {
 
@@ -33,6 +34,15 @@ bool Init(int argc, char** argv);
 // least disturbed by other work on the machine.
 benchmark::internal::Benchmark*
 Register(const std::string& name, std::function<void(benchmark::State&)> body, int repetitions = 5);
+
+// Two kinds of work measured in turn, in alternating order, so that both
+// meet the same conditions on the machine: the pair's figure is the ratio of
+// their fastest CPU times, reported in milliseconds as the counters
+// "first_ms" and "second_ms". make builds both (once the data is known); a
+// work returns false when it went wrong.
+using Work = std::function<bool()>;
+benchmark::internal::Benchmark*
+RegisterPair(const std::string& name, std::function<std::pair<Work, Work>()> make, int rounds = 8);
 
 // A control on a module state of its own, with message boxes nobody sees.
 class BenchCard {

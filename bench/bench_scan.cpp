@@ -6,7 +6,9 @@
 #include "platform/Encoding.h"
 
 #include <cstdint>
+#include <memory>
 #include <string>
+#include <utility>
 
 namespace dovrel::bench {
 namespace {
@@ -26,22 +28,58 @@ int64_t Records(const std::string& dir) {
     return (FileBytes(DocFile(dir)) + kDocRecord / 2) / kDocRecord;
 }
 
-// One whole walk: forward it stops after the last record, backward before
-// record 2; anything else means it found a document or failed.
-void Walk(benchmark::State& state, const std::string& dir, BenchCard& bench, int16_t row,
-          const std::string& direction, const std::string& fromDate = std::string()) {
-    bool backward = direction == "Last" || direction == "Previous";
-    int64_t expected = backward ? 1 : Records(dir) + 1;
-    for (auto _ : state) {
-        if (direction == "Previous")
-            bench.card().PubACTLocation = static_cast<int32_t>(Records(dir) + 1);
-        int32_t stopped = bench.read(dir, row, direction, fromDate);
-        if (stopped != expected || bench.messages() != 0) {
-            state.SkipWithError("the walk did not cover the whole file without a find");
-            return;
-        }
+// A control set up for one kind of walk over a whole file.
+class Walker {
+public:
+    Walker(std::string dir, int16_t row, std::string direction, std::string fromDate = {})
+        : dir_(std::move(dir)), row_(row), direction_(std::move(direction)),
+          fromDate_(std::move(fromDate)) {}
+
+    BenchCard& bench() { return bench_; }
+
+    // One walk. Forward it stops after the last record, backward before
+    // record 2; anything else means it found a document or failed.
+    bool once() {
+        bool backward = direction_ == "Last" || direction_ == "Previous";
+        if (direction_ == "Previous")
+            bench_.card().PubACTLocation = static_cast<int32_t>(Records(dir_) + 1);
+        int32_t stopped = bench_.read(dir_, row_, direction_, fromDate_);
+        return stopped == (backward ? 1 : Records(dir_) + 1) && bench_.messages() == 0;
     }
-    state.SetBytesProcessed(state.iterations() * FileBytes(DocFile(dir)));
+
+    void run(benchmark::State& state) {
+        for (auto _ : state) {
+            if (!once()) {
+                state.SkipWithError("the walk did not cover the whole file without a find");
+                return;
+            }
+        }
+        state.SetBytesProcessed(state.iterations() * FileBytes(DocFile(dir_)));
+    }
+
+private:
+    BenchCard bench_;
+    std::string dir_;
+    int16_t row_;
+    std::string direction_;
+    std::string fromDate_;
+};
+
+std::shared_ptr<Walker> CustomerWalk(const std::string& dir, const std::string& direction) {
+    auto walker = std::make_shared<Walker>(dir, kInvoiceRow, direction);
+    walker->bench().search("CustomerName", kNoCustomer);
+    return walker;
+}
+
+std::shared_ptr<Walker> ItemKeyWalk(const std::string& dir, const std::string& direction) {
+    auto walker = std::make_shared<Walker>(dir, kInvoiceRow, direction);
+    walker->bench().search("ItemKey", kNoItem);
+    walker->bench().card().txtItemKey.setText(FromUtf8(kNoItem));
+    return walker;
+}
+
+Work Once(std::shared_ptr<Walker> walker) {
+    return [walker] { return walker->once(); };
 }
 
 void RegisterBaselines() {
@@ -62,64 +100,45 @@ void RegisterBaselines() {
 
 void RegisterForward() {
     Register("Scan/WrongType/1GiB", [](benchmark::State& state) {
-        BenchCard bench;
-        Walk(state, Data().big, bench, kBondedExitRow, "First");
+        Walker(Data().big, kBondedExitRow, "First").run(state);
     });
-    for (const auto& [name, dir] :
-         {std::pair{"1GiB", &DataSets::big}, std::pair{"100MiB", &DataSets::medium}}) {
-        Register(std::string("Scan/CustomerName/") + name, [dir](benchmark::State& state) {
-            BenchCard bench;
-            bench.search("CustomerName", kNoCustomer);
-            Walk(state, Data().*dir, bench, kInvoiceRow, "First");
-        });
-    }
-    Register("Scan/ItemKey/1GiB", [](benchmark::State& state) {
-        BenchCard bench;
-        bench.search("ItemKey", kNoItem);
-        bench.card().txtItemKey.setText(FromUtf8(kNoItem));
-        Walk(state, Data().big, bench, kInvoiceRow, "First");
-    });
-    Register("Scan/FromDate/1GiB", [](benchmark::State& state) {
-        BenchCard bench;
-        Walk(state, Data().big, bench, kInvoiceRow, "First", kAfterAll);
-    });
+    Register("Scan/CustomerName/1GiB",
+             [](benchmark::State& state) { CustomerWalk(Data().big, "First")->run(state); });
+    Register("Scan/CustomerName/100MiB",
+             [](benchmark::State& state) { CustomerWalk(Data().medium, "First")->run(state); });
+    Register("Scan/ItemKey/1GiB",
+             [](benchmark::State& state) { ItemKeyWalk(Data().big, "First")->run(state); });
 }
 
+// Backward walks against the same walks forward, in turn.
 void RegisterBackward() {
-    Register("Backward/CustomerName/1GiB", [](benchmark::State& state) {
-        BenchCard bench;
-        bench.search("CustomerName", kNoCustomer);
-        Walk(state, Data().big, bench, kInvoiceRow, "Last");
+    RegisterPair("Pair/LastVsFirst/CustomerName/1GiB", [] {
+        return std::pair{Once(CustomerWalk(Data().big, "Last")),
+                         Once(CustomerWalk(Data().big, "First"))};
     });
-    Register("Backward/FromDate/1GiB", [](benchmark::State& state) {
-        BenchCard bench;
-        Walk(state, Data().big, bench, kInvoiceRow, "Previous", kAfterAll);
+    RegisterPair("Pair/LastVsFirst/ItemKey/1GiB", [] {
+        return std::pair{Once(ItemKeyWalk(Data().big, "Last")),
+                         Once(ItemKeyWalk(Data().big, "First"))};
+    });
+    RegisterPair("Pair/PreviousVsFirst/FromDate/1GiB", [] {
+        return std::pair{
+            Once(std::make_shared<Walker>(Data().big, kInvoiceRow, "Previous", kAfterAll)),
+            Once(std::make_shared<Walker>(Data().big, kInvoiceRow, "First", kAfterAll))};
     });
 }
 
-// Progress off: nothing listens and the frame has no width, so the bar never
-// changes. On: a full frame and a listener that counts its calls. The two
-// differ by little, so they are repeated more often than the others.
+// Progress on: a full frame and a listener that counts its calls. Off:
+// nothing listens and the frame has no width, so the bar never changes.
 void RegisterProgress() {
-    constexpr int kRepetitions = 9;
-    Register(
-        "Progress/Off/1GiB",
-        [](benchmark::State& state) {
-            BenchCard bench;
-            bench.card().ProgressFrame.setWidth(0);
-            Walk(state, Data().big, bench, kBondedExitRow, "First");
-        },
-        kRepetitions);
-    Register(
-        "Progress/On/1GiB",
-        [](benchmark::State& state) {
-            BenchCard bench;
-            int64_t calls = 0;
-            bench.card().ProgressFill.changed.connect([&calls] { ++calls; });
-            Walk(state, Data().big, bench, kBondedExitRow, "First");
-            state.counters["listener_calls"] = static_cast<double>(calls);
-        },
-        kRepetitions);
+    RegisterPair("Pair/ProgressOnVsOff/1GiB", [] {
+        auto on = std::make_shared<Walker>(Data().big, kBondedExitRow, "First");
+        auto calls = std::make_shared<int64_t>(0);
+        on->bench().card().ProgressFill.changed.connect([calls] { ++*calls; });
+        auto off = std::make_shared<Walker>(Data().big, kBondedExitRow, "First");
+        off->bench().card().ProgressFrame.setWidth(0);
+        Work counted = [on, calls] { return on->once() && *calls > 0; };
+        return std::pair{counted, Once(off)};
+    });
 }
 
 void RegisterMemory() {
@@ -128,12 +147,7 @@ void RegisterMemory() {
         auto peak = [dir](benchmark::State& state) {
             ResidentMemory memory;
             for (auto _ : state) {
-                memory = MeasureInChild([dir] {
-                    BenchCard bench;
-                    bench.search("ItemKey", kNoItem);
-                    bench.card().txtItemKey.setText(FromUtf8(kNoItem));
-                    bench.read(Data().*dir, kInvoiceRow, "First");
-                });
+                memory = MeasureInChild([dir] { ItemKeyWalk(Data().*dir, "First")->once(); });
             }
             if (memory.peak < 0)
                 state.SkipWithError("the peak resident memory could not be measured");
