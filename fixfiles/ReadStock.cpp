@@ -76,7 +76,7 @@ private:
 
     Walk planWalk(const std::string& direction, int64_t records);
     Candidate tryDocument(RecordFile& file, const unsigned char* headerRec, int64_t at);
-    bool passesHeader(const Record& header, bool& matched);
+    bool passesHeader(const unsigned char* h, bool& matched);
     bool lineMatches(const unsigned char* rec);
     void processLine(const unsigned char* rec, uint8_t docType, bool& matched);
     void startGrid();
@@ -202,12 +202,14 @@ Walk StockScan::planWalk(const std::string& direction, int64_t records) {
 
 StockScan::Candidate StockScan::tryDocument(RecordFile& file, const unsigned char* headerRec,
                                             int64_t at) {
+    // Tested where it lies, copied only when it passes: most headers of a
+    // search fail.
+    bool matched = false;
+    if (!passesHeader(headerRec, matched))
+        return {false, at};
     Record header;
     std::memcpy(header.data(), headerRec, header.size());
     int lineRecords = header[158];
-    bool matched = false;
-    if (!passesHeader(header, matched))
-        return {false, at};
 
     // A header whose continuation record is not in the file yet is a document
     // still being written; it is passed over.
@@ -239,8 +241,7 @@ StockScan::Candidate StockScan::tryDocument(RecordFile& file, const unsigned cha
     return {true, p};
 }
 
-bool StockScan::passesHeader(const Record& header, bool& matched) {
-    const unsigned char* h = header.data();
+bool StockScan::passesHeader(const unsigned char* h, bool& matched) {
     matched = true;
     switch (searchBy_) {
     case SearchBy::None:

@@ -41,7 +41,7 @@ RecordFile::~RecordFile() {
         ::close(fd_);
 }
 
-const unsigned char* RecordFile::record(int64_t n) {
+const unsigned char* RecordFile::recordElsewhere(int64_t n) {
     if (n < 1)
         throw Error("Bad record number " + std::to_string(n) + " in " + path_);
     // Worked out once in the constructor: a division for every record would
