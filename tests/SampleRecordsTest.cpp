@@ -33,27 +33,28 @@ std::string Described(const json& description, const std::string& file, size_t r
 }
 
 TEST(SampleRecordsTest, DocumentRecordsMatchTheDescriptionWriter) {
-    json doc = {{"type", 5},
-                {"account", "1001"},
-                {"customer", "משה כהן (בע\"מ)"},
-                {"address1", "רח' הרצל 45"},
-                {"address2", "תל אביב"},
-                {"reference", "4711"},
-                {"remarks", {"הערה ראשונה", "", "Remark 3"}},
-                {"date", "2019-02-28"},
-                {"discountPercent", 7.5},
-                {"vatPercent", 18},
-                {"warehouse", 3},
-                {"lines",
-                 {{{"key", "A100"},
-                   {"description", "מברג חשמלי"},
-                   {"details", "X1"},
-                   {"price", 1234.5},
-                   {"quantity", 2},
-                   {"discount", 12.5}},
-                  {{"key", "*"}, {"description", "שורת טקסט"}},
-                  {{"key", "#"}, {"description", "נסתרת"}, {"price", 99}, {"quantity", 1}},
-                  {{"key", "B-200"}, {"currency", 1}, {"price", 0.1}, {"quantity", 0.5}}}}};
+    json doc = {
+        {"type", 5},
+        {"account", "1001"},
+        {"customer", "משה כהן (בע\"מ)"},
+        {"address1", "רח' הרצל 45"},
+        {"address2", "תל אביב"},
+        {"reference", "4711"},
+        {"remarks", {"הערה ראשונה", "", "Remark 3"}},
+        {"date", "2019-02-28"},
+        {"discountPercent", 7.5},
+        {"vatPercent", 18},
+        {"warehouse", 3},
+        {"lines",
+         {{{"key", "A100"},
+           {"description", "מברג חשמלי"},
+           {"details", "X1"},
+           {"price", 1234.5},
+           {"quantity", 2},
+           {"discount", 12.5}},
+          {{"key", "*"}, {"description", "שורת טקסט"}},
+          {{"key", "#"}, {"description", "נסתרת"}, {"price", 99}, {"quantity", 1}},
+          {{"key", "B-200"}, {"currency", 1}, {"price", 0.1}, {"quantity", 0.5}, {"rate", 3.7}}}}};
     sample::DocumentSpec spec;
     spec.type = 5;
     spec.account = StoredText("1001", 8);
@@ -66,10 +67,11 @@ TEST(SampleRecordsTest, DocumentRecordsMatchTheDescriptionWriter) {
     spec.discountPercent = 7.5;
     spec.vatPercent = 18;
     spec.warehouse = 3;
-    spec.lines = {{StoredText("A100", 12), StoredText("מברג חשמלי", 40), "X1", 21, 1234.5, 2, 12.5},
-                  {"*", StoredText("שורת טקסט", 40), "", 21, 0, 0, 0},
-                  {"#", StoredText("נסתרת", 40), "", 21, 99, 1, 0},
-                  {"B-200", "", "", 1, 0.1, 0.5, 0}};
+    spec.lines = {
+        {StoredText("A100", 12), StoredText("מברג חשמלי", 40), "X1", 21, 1234.5, 2, 12.5, 1},
+        {"*", StoredText("שורת טקסט", 40), "", 21, 0, 0, 0, 1},
+        {"#", StoredText("נסתרת", 40), "", 21, 99, 1, 0, 1},
+        {"B-200", "", "", 1, 0.1, 0.5, 0, 3.7}};
     std::string records;
     sample::AppendDocumentRecords(spec, records);
     EXPECT_EQ(records, Described({{"documents", {doc}}}, "IMV.FIX", 170));
@@ -113,7 +115,7 @@ TEST(SampleRecordsTest, FilesByTypeAndBadValues) {
     bad.type = 256;
     fails(bad);
     bad = {};
-    bad.lines = {{"A1", "", "", 21, 1, 1, 400}};
+    bad.lines = {{"A1", "", "", 21, 1, 1, 400, 1}};
     fails(bad);
     bad = {};
     bad.lines.resize(256);

@@ -244,9 +244,11 @@ LineSpec MakeLine(const BigCompanyPools& pools, Random& rng) {
     line.description = item.description;
     if (rng.below(10) < 3)
         line.details = pools.details[rng.below(pools.details.size())];
+    // Mostly shekels; now and then dollars or euros at a shekel rate.
     uint64_t currency = rng.below(20);
     line.currency = currency < 17 ? 21 : (currency < 19 ? 1 : 4);
-    line.price = line.currency == 21 ? item.price : std::round(item.price / 3.6 * 100) / 100;
+    line.rate = line.currency == 21 ? 1 : (line.currency == 1 ? 3.6 : 4.0);
+    line.price = std::round(item.price / line.rate * 100) / 100;
     line.quantity = rng.below(8) == 0 ? 0.5 * static_cast<double>(1 + rng.below(9))
                                       : static_cast<double>(1 + rng.skewed(20));
     static const double kDiscounts[] = {5, 10, 12.5, 15};

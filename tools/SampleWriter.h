@@ -46,6 +46,7 @@ struct LineSpec {
     double price = 0;
     double quantity = 0;
     double discount = 0; // percent, kept to hundredths
+    double rate = 1;     // not stored: the shekel value of one unit of the currency
 };
 
 // A document whose lines are numbered from 1 and all belong to its type;
