@@ -32,9 +32,10 @@ public:
 
     // False only when LogicalText of the field cannot contain the text.
     bool mayContain(std::string_view field) const {
+        const ByteTables& tables = Tables();
         Mask has{};
         for (char c : field)
-            set(has, Decoded(static_cast<unsigned char>(c)));
+            set(has, tables.decoded[static_cast<unsigned char>(c)]);
         for (size_t i = 0; i < needs_.size(); ++i)
             if ((needs_[i] & ~has[i]) != 0)
                 return false;
@@ -44,17 +45,38 @@ public:
     // A digest of the Latin letters and digits of a text, case folded, that
     // does not depend on their order; 0 for a text without any.
     static uint64_t LatinDigest(std::string_view text) {
+        const ByteTables& tables = Tables();
         uint64_t digest = 0;
-        for (char c : text) {
-            auto u = static_cast<unsigned char>(c);
-            if ((u >= '0' && u <= '9') || (u >= 'a' && u <= 'z') || (u >= 'A' && u <= 'Z'))
-                digest += Spread(Fold(u));
-        }
+        for (char c : text)
+            digest += tables.latin[static_cast<unsigned char>(c)];
         return digest;
     }
 
 private:
     using Mask = std::array<uint64_t, 4>;
+
+    // Worked out once for every byte, since a scan asks for millions of
+    // bytes: what each adds to a digest (0 for all but Latin letters and
+    // digits), and the character it becomes when decoded.
+    struct ByteTables {
+        std::array<uint64_t, 256> latin{};
+        std::array<unsigned char, 256> decoded{};
+    };
+
+    static const ByteTables& Tables() {
+        static const ByteTables tables = [] {
+            ByteTables t;
+            for (int i = 0; i < 256; ++i) {
+                auto c = static_cast<unsigned char>(i);
+                bool latin =
+                    (c >= '0' && c <= '9') || (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z');
+                t.latin[c] = latin ? Spread(Fold(c)) : 0;
+                t.decoded[c] = Decoded(c);
+            }
+            return t;
+        }();
+        return tables;
+    }
 
     static void set(Mask& mask, unsigned char c) { mask[c >> 6] |= uint64_t{1} << (c & 63); }
 

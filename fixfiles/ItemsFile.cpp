@@ -8,6 +8,7 @@
 #include "platform/FileSystem.h"
 
 #include <algorithm>
+#include <array>
 #include <string_view>
 #include <unordered_map>
 #include <vector>
@@ -34,17 +35,27 @@ std::string FoldKey(std::string_view key) {
 // holds it, and the sorted Latin digests of those keys. An item record whose
 // key field has none of these digests cannot match any line and is passed
 // over without being decoded: most of a large items file is passed over so.
+// A bit per value of a digest's top 12 bits answers most records at once.
 struct ItemIndex {
     std::unordered_map<std::string, int> firstEntry;
     std::vector<uint64_t> digests;
+    std::array<uint64_t, 64> digestBits{};
 
     explicit ItemIndex(const CurrentDocument& doc) {
         int count = std::clamp<int>(doc.lineCount, 0, kMaxDocLines);
         for (int entry = 1; entry <= count; ++entry)
             firstEntry.try_emplace(FoldKey(Trim(doc.lines[entry].itemKey)), entry);
-        for (const auto& entry : firstEntry)
-            digests.push_back(FieldPrefilter::LatinDigest(entry.first));
+        for (const auto& entry : firstEntry) {
+            uint64_t digest = FieldPrefilter::LatinDigest(entry.first);
+            digests.push_back(digest);
+            digestBits[digest >> 58] |= uint64_t{1} << ((digest >> 52) & 63);
+        }
         std::sort(digests.begin(), digests.end());
+    }
+
+    bool mayHold(uint64_t digest) const {
+        return ((digestBits[digest >> 58] >> ((digest >> 52) & 63)) & 1) != 0 &&
+               std::binary_search(digests.begin(), digests.end(), digest);
     }
 };
 
@@ -52,8 +63,7 @@ struct ItemIndex {
 // has its key, if any.
 void ApplyItem(const unsigned char* record, const ItemIndex& index, CurrentDocument& doc) {
     std::string_view stored = Field(record, kItemKeyOffset, kItemKeyWidth);
-    if (!std::binary_search(index.digests.begin(), index.digests.end(),
-                            FieldPrefilter::LatinDigest(stored)))
+    if (!index.mayHold(FieldPrefilter::LatinDigest(stored)))
         return;
     auto found = index.firstEntry.find(FoldKey(Trim(LogicalText(stored))));
     if (found == index.firstEntry.end())
