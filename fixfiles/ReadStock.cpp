@@ -117,6 +117,27 @@ const FieldPrefilter& StockScan::filterFor(std::optional<FieldPrefilter>& filter
     return *filter;
 }
 
+// The document date of a continuation record. Worked out only where it is
+// used: a search tries many documents that neither the date nor the page needs.
+Date DateOf(const std::array<unsigned char, kDocRecordLength>& cont) {
+    return DateSerial(cont[102] + 1900, cont[103], cont[104]);
+}
+
+// Whether the item key field, trimmed, is "#". Asked of every line a search
+// meets, so it looks at the bytes instead of trimming: a key that starts
+// with anything but a space or "#" is answered at once.
+bool IsHiddenLine(const unsigned char* rec) {
+    bool hash = false;
+    for (size_t i = 1; i <= 12; ++i) {
+        if (rec[i] == ' ')
+            continue;
+        if (rec[i] != '#' || hash)
+            return false;
+        hash = true;
+    }
+    return hash;
+}
+
 std::string AccountKeyOf(const unsigned char* header) {
     return TrimCopy(LogicalText(Field(header, 2, 8)));
 }
@@ -218,8 +239,7 @@ StockScan::Candidate StockScan::tryDocument(RecordFile& file, const unsigned cha
         return {false, at + 1};
     Record cont;
     std::memcpy(cont.data(), contRec, cont.size());
-    Date date = DateSerial(cont[102] + 1900, cont[103], cont[104]);
-    if (fromDate_ && date < *fromDate_)
+    if (fromDate_ && DateOf(cont) < *fromDate_)
         return {false, at + 1};
 
     // The grid is reset when the document shows its first line or is
@@ -237,7 +257,7 @@ StockScan::Candidate StockScan::tryDocument(RecordFile& file, const unsigned cha
     }
     if (!matched)
         return {false, p};
-    accept(header, cont, date);
+    accept(header, cont, DateOf(cont));
     return {true, p};
 }
 
@@ -288,13 +308,13 @@ void StockScan::startGrid() {
 }
 
 void StockScan::processLine(const unsigned char* rec, uint8_t docType, bool& matched) {
-    std::string_view rawKey = Trim(Field(rec, 1, 12));
-    if (rawKey == "#" || rec[93] != docType)
+    if (rec[93] != docType || IsHiddenLine(rec))
         return;
     if (!matched)
         matched = lineMatches(rec);
     if (!matched)
         return;
+    std::string_view rawKey = Trim(Field(rec, 1, 12));
     std::string itemKey = TrimCopy(LogicalText(Field(rec, 1, 12)));
     std::string details = TrimCopy(LogicalText(Trim(Field(rec, 64, 8))));
 
