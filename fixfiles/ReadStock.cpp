@@ -206,7 +206,8 @@ Walk StockScan::planWalk(const std::string& direction, int64_t records) {
         return {2, records, 1};
     }
     if (EqualsNoCase(direction, "Next")) {
-        int64_t next = std::min(position + 1, records);
+        // An empty file has no last record to stop at; the walk finds nothing.
+        int64_t next = records == 0 && position >= 0 ? 1 : std::min(position + 1, records);
         view_.PubACTLocation = static_cast<int32_t>(next);
         return {next, records, 1};
     }

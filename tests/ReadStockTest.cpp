@@ -419,6 +419,10 @@ TEST_F(ReadStockTest, DamagedFilesNeverCrashTheReader) {
     EXPECT_EQ(read("First"), 2);
     EXPECT_EQ(read("Last"), 0);
     EXPECT_EQ(box(card->txtReference1), "");
+    card->PubACTLocation = 7;
+    EXPECT_EQ(read("Next"), 1);
+    EXPECT_EQ(read("Previous"), 0);
+    EXPECT_TRUE(messages.shown().empty());
 }
 
 TEST_F(ReadStockTest, ProgressMovesDuringALongScanAndEndsEmpty) {
