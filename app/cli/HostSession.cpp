@@ -52,8 +52,10 @@ void HostSession::newCard(size_t slot, const json& elements) {
     if (forms_.showing())
         throw Error("A control cannot be made while one of its forms is shown");
     std::map<std::string, std::string> values;
+    // A null element is one the page does not have; a number is its text.
     for (const auto& [id, value] : elements.items())
-        values[id] = value.is_string() ? HostArgs::Text(value, id) : value.dump();
+        if (!value.is_null())
+            values[id] = value.is_string() ? HostArgs::Text(value, id) : value.dump();
     ElementsContainer container(std::move(values));
     CardServices services{messages_, *settings_, forms_, clipboard_};
     cards_[slot] = std::make_unique<Card>(services, shared_);
