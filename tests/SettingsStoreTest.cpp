@@ -20,6 +20,7 @@
 #include <optional>
 #include <sstream>
 #include <thread>
+#include <type_traits>
 
 namespace dovrel {
 namespace {
@@ -30,21 +31,15 @@ using ::testing::HasSubstr;
 using ::testing::Pair;
 
 // The same behaviour is asked of both stores.
-template <typename Store> struct Maker;
-template <> struct Maker<MemorySettingsStore> {
-    std::unique_ptr<SettingsStore> make() { return std::make_unique<MemorySettingsStore>(); }
-};
-template <> struct Maker<SqliteSettingsStore> {
-    test::TempDir dir;
-    std::unique_ptr<SettingsStore> make() {
-        return std::make_unique<SqliteSettingsStore>(dir.str() + "/dovrel/settings.db");
-    }
-};
-
 template <typename Store> class EveryStoreTest : public ::testing::Test {
 protected:
-    Maker<Store> maker;
-    std::unique_ptr<SettingsStore> store = maker.make();
+    test::TempDir dir;
+    std::unique_ptr<SettingsStore> store = [this]() -> std::unique_ptr<SettingsStore> {
+        if constexpr (std::is_same_v<Store, SqliteSettingsStore>)
+            return std::make_unique<Store>(dir.str() + "/dovrel/settings.db");
+        else
+            return std::make_unique<Store>();
+    }();
 };
 using Stores = ::testing::Types<MemorySettingsStore, SqliteSettingsStore>;
 TYPED_TEST_SUITE(EveryStoreTest, Stores);
@@ -85,11 +80,11 @@ TYPED_TEST(EveryStoreTest, KeepsApplicationsAndSectionsApartAndSortsKeysWithoutC
     EXPECT_FALSE(s.DeleteSetting("Dovrel8", "Params", "b"));
 }
 
-// Runs work and gives its Error's description, or nothing when it succeeded.
-std::optional<std::string> FailureOf(const std::function<void()>& work) {
+// Runs work and gives its Error's description ("" when it succeeded).
+std::string FailureOf(const std::function<void()>& work) {
     try {
         work();
-        return std::nullopt;
+        return "";
     } catch (const Error& e) {
         return e.what();
     }
@@ -98,23 +93,14 @@ std::optional<std::string> FailureOf(const std::function<void()>& work) {
 // The failure of work run in a child process after prepare (which returns
 // false when the child cannot be set up), so that what the child changes about
 // itself (its user, its file size limit) ends with it.
-std::optional<std::string> FailureInChild(const std::function<bool()>& prepare,
-                                          const std::function<void()>& work) {
+std::string FailureInChild(const std::function<bool()>& prepare,
+                           const std::function<void()>& work) {
     int fds[2];
     if (pipe(fds) != 0)
         return "pipe failed";
     pid_t child = fork();
     if (child == 0) {
-        close(fds[0]);
-        std::string answer = "-";
-        if (!prepare())
-            answer = "!cannot prepare the child";
-        else
-            try {
-                work();
-            } catch (const Error& e) {
-                answer = std::string("E") + e.what();
-            }
+        std::string answer = prepare() ? "-" + FailureOf(work) : "cannot prepare the child";
         ssize_t written = write(fds[1], answer.data(), answer.size());
         _exit(written == static_cast<ssize_t>(answer.size()) ? 0 : 1);
     }
@@ -125,14 +111,12 @@ std::optional<std::string> FailureInChild(const std::function<bool()>& prepare,
         answer.append(buffer, static_cast<size_t>(n));
     close(fds[0]);
     waitpid(child, nullptr, 0);
-    if (answer.empty() || answer[0] == '!')
-        return "child failed: " + answer;
-    return answer[0] == 'E' ? std::optional(answer.substr(1)) : std::nullopt;
+    return answer.starts_with("-") ? answer.substr(1) : "child failed: " + answer;
 }
 
 // The same, where file modes matter: when the tests run as root, which they do not stop, the
 // work runs in a child process as "nobody".
-std::optional<std::string> FailureAsUser(const std::function<void()>& work) {
+std::string FailureAsUser(const std::function<void()>& work) {
     if (geteuid() != 0)
         return FailureOf(work);
     return FailureInChild([] { return setgid(65534) == 0 && setuid(65534) == 0; }, work);
@@ -148,6 +132,18 @@ protected:
     test::TempDir dir;
     std::filesystem::path file = dir.path() / "cfg" / "dovrel" / "settings.db";
     SqliteSettingsStore store{file.string()};
+
+    std::string get(const std::string& key) { return store.GetSetting("Dovrel", "Params", key, ""); }
+    void save(const std::string& key, const std::string& value) {
+        store.SaveSetting("Dovrel", "Params", key, value);
+    }
+    // Every call of the store, each as work for FailureOf.
+    std::vector<std::function<void()>> everyCall() {
+        return {[this] { store.GetSetting("Dovrel", "Params", "CompPath", "default"); },
+                [this] { save("CompPath", "x"); },
+                [this] { store.ListSettings("Dovrel", "Params"); },
+                [this] { store.DeleteSetting("Dovrel", "Params", "CompPath"); }};
+    }
 };
 
 TEST_F(SqliteStoreTest, ReadsCreateNothingAndTheFirstSaveMakesAPrivateFile) {
@@ -156,7 +152,7 @@ TEST_F(SqliteStoreTest, ReadsCreateNothingAndTheFirstSaveMakesAPrivateFile) {
     EXPECT_FALSE(store.DeleteSetting("Dovrel", "Params", "CompPath"));
     EXPECT_FALSE(std::filesystem::exists(dir.path() / "cfg"));
 
-    store.SaveSetting("Dovrel", "Params", "CompPath", "d:\\x");
+    save("CompPath", "d:\\x");
     EXPECT_EQ(ModeOf(dir.path() / "cfg"), 0700u);
     EXPECT_EQ(ModeOf(file.parent_path()), 0700u);
     EXPECT_EQ(ModeOf(file), 0600u);
@@ -166,9 +162,9 @@ TEST_F(SqliteStoreTest, ReadsCreateNothingAndTheFirstSaveMakesAPrivateFile) {
 
 TEST_F(SqliteStoreTest, TwoConnectionsOnOneFileTheLastSaveWinsKeyByKey) {
     SqliteSettingsStore other(file.string());
-    store.SaveSetting("Dovrel", "Params", "CompPath", "a1");
+    save("CompPath", "a1");
     other.SaveSetting("Dovrel", "Params", "Title", "b1");
-    store.SaveSetting("Dovrel", "Params", "title", "a2");
+    save("title", "a2");
     other.SaveSetting("Dovrel", "Params", "COMPPATH", "b2");
     for (SqliteSettingsStore* s : {&store, &other})
         EXPECT_THAT(s->ListSettings("Dovrel", "Params"),
@@ -192,15 +188,16 @@ TEST_F(SqliteStoreTest, DefaultPathFollowsTheXdgRules) {
         return value ? std::optional<std::string>(value) : std::nullopt;
     };
     std::optional<std::string> config = keep("XDG_CONFIG_HOME"), home = keep("HOME");
+    const std::string dana = "/home/dana/.config/dovrel/settings.db";
     setenv("HOME", "/home/dana", 1);
     setenv("XDG_CONFIG_HOME", "/srv/conf/", 1);
     EXPECT_EQ(SqliteSettingsStore::DefaultPath(), "/srv/conf/dovrel/settings.db");
     setenv("XDG_CONFIG_HOME", "relative/conf", 1);
-    EXPECT_EQ(SqliteSettingsStore::DefaultPath(), "/home/dana/.config/dovrel/settings.db");
+    EXPECT_EQ(SqliteSettingsStore::DefaultPath(), dana);
     setenv("XDG_CONFIG_HOME", "", 1);
-    EXPECT_EQ(SqliteSettingsStore::DefaultPath(), "/home/dana/.config/dovrel/settings.db");
+    EXPECT_EQ(SqliteSettingsStore::DefaultPath(), dana);
     unsetenv("XDG_CONFIG_HOME");
-    EXPECT_EQ(SqliteSettingsStore().path(), "/home/dana/.config/dovrel/settings.db");
+    EXPECT_EQ(SqliteSettingsStore().path(), dana);
     for (auto [name, value] : {std::pair{"XDG_CONFIG_HOME", config}, std::pair{"HOME", home}})
         value ? setenv(name, value->c_str(), 1) : unsetenv(name);
 }
@@ -209,103 +206,78 @@ TEST_F(SqliteStoreTest, ADamagedFileOrADirectoryIsAnErrorNamingTheFile) {
     std::filesystem::create_directories(file.parent_path());
     const std::string garbage(3000, '\x5a');
     std::ofstream(file, std::ios::binary) << garbage;
-    std::function<void()> get = [this] {
-        store.GetSetting("Dovrel", "Params", "CompPath", "default");
-    };
-    std::function<void()> save = [this] { store.SaveSetting("Dovrel", "Params", "CompPath", "x"); };
-    std::function<void()> list = [this] { store.ListSettings("Dovrel", "Params"); };
-    std::function<void()> remove = [this] { store.DeleteSetting("Dovrel", "Params", "CompPath"); };
-    EXPECT_THAT(FailureOf(get).value_or(""), HasSubstr("Cannot read setting \"CompPath\" from " +
-                                                       file.string() + ": file is not a database"));
-    for (const auto& work : {save, list, remove})
-        EXPECT_THAT(FailureOf(work).value_or(""), HasSubstr(file.string()));
+    EXPECT_THAT(FailureOf(everyCall()[0]), HasSubstr("Cannot read setting \"CompPath\" from " +
+                                                     file.string() + ": file is not a database"));
+    for (const auto& work : everyCall())
+        EXPECT_THAT(FailureOf(work), HasSubstr(file.string()));
     std::ostringstream kept;
     kept << std::ifstream(file, std::ios::binary).rdbuf();
     EXPECT_EQ(kept.str(), garbage);
 
     std::filesystem::remove(file);
     std::filesystem::create_directory(file);
-    for (const auto& work : {get, save, list, remove})
-        EXPECT_THAT(FailureOf(work).value_or(""), HasSubstr(file.string()));
+    for (const auto& work : everyCall())
+        EXPECT_THAT(FailureOf(work), HasSubstr(file.string()));
 }
 
 TEST_F(SqliteStoreTest, AReadOnlyDirectoryFailsTheSaveAndLosesNothing) {
+    const std::string failed = "Cannot save setting \"CompPath\" to " + file.string() + ": ";
     std::filesystem::create_directories(dir.path() / "cfg");
     chmod((dir.path() / "cfg").c_str(), 0555);
-    EXPECT_THAT(FailureAsUser([this] {
-                    store.SaveSetting("Dovrel", "Params", "CompPath", "x");
-                }).value_or(""),
-                HasSubstr("Cannot save setting \"CompPath\" to " + file.string() +
-                          ": cannot create the directory " + file.parent_path().string()));
+    EXPECT_THAT(FailureAsUser([this] { save("CompPath", "x"); }),
+                HasSubstr(failed + "cannot create the directory " + file.parent_path().string()));
     chmod((dir.path() / "cfg").c_str(), 0755);
 
-    store.SaveSetting("Dovrel", "Params", "CompPath", "kept");
+    save("CompPath", "kept");
     chmod(file.c_str(), 0444);
     chmod(file.parent_path().c_str(), 0555);
-    EXPECT_THAT(FailureAsUser([this] {
-                    store.SaveSetting("Dovrel", "Params", "CompPath", "new");
-                }).value_or(""),
-                HasSubstr("Cannot save setting \"CompPath\" to " + file.string() +
-                          ": attempt to write a readonly database"));
-    EXPECT_EQ(FailureAsUser([this] { store.GetSetting("Dovrel", "Params", "CompPath", ""); }),
-              std::nullopt);
+    EXPECT_THAT(FailureAsUser([this] { save("CompPath", "new"); }),
+                HasSubstr(failed + "attempt to write a readonly database"));
+    EXPECT_EQ(FailureAsUser([this] { get("CompPath"); }), "");
     chmod(file.parent_path().c_str(), 0700);
-    EXPECT_EQ(store.GetSetting("Dovrel", "Params", "CompPath", ""), "kept");
+    EXPECT_EQ(get("CompPath"), "kept");
 }
 
 // A full disk: in a child whose files may not grow past their present size, a
 // save that needs more room fails plainly, and every stored value stays.
 TEST_F(SqliteStoreTest, AFullDiskFailsTheSaveAndLosesNothing) {
-    store.SaveSetting("Dovrel", "Params", "CompPath", "kept");
+    save("CompPath", "kept");
     auto size = static_cast<rlim_t>(std::filesystem::file_size(file));
-    std::optional<std::string> failure = FailureInChild(
+    std::string failure = FailureInChild(
         [size] {
             rlimit limit{size, size};
             return signal(SIGXFSZ, SIG_IGN) != SIG_ERR && setrlimit(RLIMIT_FSIZE, &limit) == 0;
         },
-        [this] { store.SaveSetting("Dovrel", "Params", "Big", std::string(1 << 20, 'x')); });
-    EXPECT_THAT(failure.value_or(""), HasSubstr("Cannot save setting \"Big\" to " + file.string()));
-    EXPECT_EQ(store.GetSetting("Dovrel", "Params", "CompPath", ""), "kept");
+        [this] { save("Big", std::string(1 << 20, 'x')); });
+    EXPECT_THAT(failure, HasSubstr("Cannot save setting \"Big\" to " + file.string()));
+    EXPECT_EQ(get("CompPath"), "kept");
     EXPECT_FALSE(store.FindSetting("Dovrel", "Params", "Big"));
-    store.SaveSetting("Dovrel", "Params", "CompPath", "after");
-    EXPECT_EQ(store.GetSetting("Dovrel", "Params", "CompPath", ""), "after");
+    save("CompPath", "after");
+    EXPECT_EQ(get("CompPath"), "after");
 }
 
-// Another connection that holds a write transaction on the file.
-class Holder {
-public:
-    explicit Holder(const std::string& path) { sqlite3_open(path.c_str(), &db_); }
-    ~Holder() { sqlite3_close(db_); }
-    int exec(const char* sql) { return sqlite3_exec(db_, sql, nullptr, nullptr, nullptr); }
-
-private:
-    sqlite3* db_ = nullptr;
-};
-
 TEST_F(SqliteStoreTest, ALockHeldPastTheTimeoutFailsAndLosesNothing) {
-    store.SaveSetting("Dovrel", "Params", "CompPath", "old");
-    store.SaveSetting("Dovrel", "Params", "Title", "old title");
+    save("CompPath", "old");
+    save("Title", "old title");
     store.setBusyTimeout(std::chrono::milliseconds(50));
-    Holder holder(file.string());
-    ASSERT_EQ(holder.exec("BEGIN IMMEDIATE; UPDATE settings SET value = 'held'"), SQLITE_OK);
-    EXPECT_THROW(
-        {
-            try {
-                store.SaveSetting("Dovrel", "Params", "CompPath", "new");
-            } catch (const Error& e) {
-                EXPECT_THAT(e.what(), HasSubstr(file.string() + ": database is locked"));
-                throw;
-            }
-        },
-        Error);
-    EXPECT_THROW(store.DeleteSetting("Dovrel", "Params", "Title"), Error);
+    // Another connection that holds a write transaction on the file.
+    sqlite3* holder = nullptr;
+    sqlite3_open(file.c_str(), &holder);
+    std::unique_ptr<sqlite3, int (*)(sqlite3*)> closer(holder, sqlite3_close);
+    auto exec = [holder](const char* sql) {
+        return sqlite3_exec(holder, sql, nullptr, nullptr, nullptr);
+    };
+    ASSERT_EQ(exec("BEGIN IMMEDIATE; UPDATE settings SET value = 'held'"), SQLITE_OK);
+    EXPECT_THAT(FailureOf([this] { save("CompPath", "new"); }),
+                HasSubstr(file.string() + ": database is locked"));
+    EXPECT_NE(FailureOf([this] { store.DeleteSetting("Dovrel", "Params", "Title"); }), "");
     // Readers still see the last committed values while the other writes.
-    EXPECT_EQ(store.GetSetting("Dovrel", "Params", "CompPath", ""), "old");
+    EXPECT_EQ(get("CompPath"), "old");
 
-    ASSERT_EQ(holder.exec("ROLLBACK; BEGIN EXCLUSIVE"), SQLITE_OK);
-    EXPECT_THROW(store.GetSetting("Dovrel", "Params", "CompPath", "default"), Error);
-    EXPECT_THROW(store.ListSettings("Dovrel", "Params"), Error);
-    ASSERT_EQ(holder.exec("ROLLBACK"), SQLITE_OK);
+    ASSERT_EQ(exec("ROLLBACK; BEGIN EXCLUSIVE"), SQLITE_OK);
+    EXPECT_NE(FailureOf([this] { get("CompPath"); }), "");
+    EXPECT_NE(FailureOf([this] { store.ListSettings("Dovrel", "Params"); }), "");
+    ASSERT_EQ(exec("ROLLBACK"), SQLITE_OK);
     EXPECT_THAT(store.ListSettings("Dovrel", "Params"),
                 ElementsAre(Pair("CompPath", "old"), Pair("Title", "old title")));
 }
