@@ -1,19 +1,16 @@
 // The document reader on a file that another process rewrites, extends and
 // shortens while the reader walks it in every direction.
 //
-// The writer's file is laid out on a fixed grid: record 1 a filler, then
-// documents of five records each (header, continuation, three line slots).
-// Every version of the file it writes is copied, offset for offset, from one
-// of three images made by the sample-company writer; the images differ in
-// references, dates and lines, but the header of the document at slot k has
-// the same account and customer in all of them. So whatever mixture of
-// versions the reader sees, a document it shows must carry the account and
-// customer of its slot, and a reference of that slot.
+// The writer's file holds a filler record, then documents of five records each
+// (header, continuation, three line slots). Every version it writes is copied,
+// offset for offset, from one of three sample-company images that differ in
+// references, dates and lines but give the document at slot k the same account
+// and customer. So whatever mixture of versions the reader sees, a document it
+// shows must carry the account, the customer and a reference of its slot.
 //
-// Now and then the reader meets a record while it is being written: half
-// new bytes, half zeros (the writer never writes a zero byte in a text). Such
-// a document may show, with the zeros in its texts, or the reader reports
-// the line number 0 it read; both are counted and must stay rare.
+// A record met while it is being written (half new bytes, half zeros; the writer
+// never writes a zero byte in a text) may show with the zeros in its texts, or
+// the reader reports the line number 0 it read; both are counted and must stay rare.
 
 #include "control/Card.h"
 #include "fixfiles/ReadStock.h"
@@ -32,7 +29,6 @@
 #include <unistd.h>
 
 #include <atomic>
-#include <cstring>
 #include <filesystem>
 #include <fstream>
 #include <iterator>
@@ -109,42 +105,41 @@ struct Progress {
 // The writer process: only pwrite and ftruncate on its own descriptor, no
 // allocation. Runs until killed; the alarm and the parent-death signal end it
 // if the test itself dies.
-class Writer {
-public:
-    Writer(int fd, const std::string (&images)[kVariants], int64_t size, Progress& progress)
-        : fd_(fd), images_(images), size_(size), progress_(progress) {}
+struct Writer {
+    int fd;
+    const std::string* images;
+    int64_t size;
+    Progress& progress;
 
     [[noreturn]] void run() {
         prctl(PR_SET_PDEATHSIG, SIGKILL);
         alarm(120);
-        progress_.started.store(true);
+        progress.started.store(true);
         uint64_t random = 0x9E3779B97F4A7C15ULL;
         const timespec pause{0, 20'000};
-        for (;;) {
-            uint64_t r = NextRandom(random);
-            if (!step(r % 8, NextRandom(random)))
+        for (;; nanosleep(&pause, nullptr)) {
+            uint64_t what = NextRandom(random) % 8;
+            if (!step(what, NextRandom(random)))
                 _exit(3);
-            progress_.operations.fetch_add(1);
-            nanosleep(&pause, nullptr);
+            progress.operations.fetch_add(1);
         }
     }
 
-private:
     // Documents whose header starts before the end of the file.
-    int64_t docs() const { return size_ <= kRec ? 0 : (size_ - kRec + kDocBytes - 1) / kDocBytes; }
+    int64_t docs() const { return size <= kRec ? 0 : (size - kRec + kDocBytes - 1) / kDocBytes; }
 
     bool copy(int variant, int64_t offset, int64_t length) {
-        const char* from = images_[variant].data() + offset;
-        if (::pwrite(fd_, from, static_cast<size_t>(length), offset) != length)
+        const char* from = images[variant].data() + offset;
+        if (::pwrite(fd, from, static_cast<size_t>(length), offset) != length)
             return false;
-        size_ = std::max(size_, offset + length);
+        size = std::max(size, offset + length);
         return true;
     }
     bool shorten(int64_t length) {
-        if (length >= size_)
+        if (length >= size)
             return true;
-        size_ = length;
-        return ::ftruncate(fd_, length) == 0;
+        size = length;
+        return ::ftruncate(fd, length) == 0;
     }
 
     bool step(uint64_t what, uint64_t r) {
@@ -158,10 +153,10 @@ private:
             return docs() == 0 || copy(variant, DocOffset(k), kDocBytes);
         case 3:
         case 4: {  // complete the last document, or append the next one
-            int64_t next = size_ <= kRec ? 0 : (size_ - kRec) / kDocBytes;
+            int64_t next = size <= kRec ? 0 : (size - kRec) / kDocBytes;
             if (next >= kDocs)
                 return true;
-            if (size_ < kRec && !copy(variant, 0, kRec))
+            if (size < kRec && !copy(variant, 0, kRec))
                 return false;
             return copy(variant, DocOffset(next), kDocBytes);
         }
@@ -174,11 +169,6 @@ private:
                    copy(variant, 0, DocOffset(static_cast<int64_t>(r % kDocs) + 1));
         }
     }
-
-    int fd_;
-    const std::string (&images_)[kVariants];
-    int64_t size_;
-    Progress& progress_;
 };
 
 // Open descriptors of this process on the file: how many, and how many of
@@ -192,18 +182,14 @@ OpenFds FindOpenFds(const std::filesystem::path& file) {
     OpenFds found;
     std::error_code ec;
     for (const auto& entry : std::filesystem::directory_iterator("/proc/self/fd", ec)) {
-        std::error_code linkError;
-        if (std::filesystem::read_symlink(entry.path(), linkError) != file)
+        if (std::filesystem::read_symlink(entry.path(), ec) != file)
             continue;
         ++found.count;
         std::ifstream info("/proc/self/fdinfo/" + entry.path().filename().string());
-        std::string key;
-        std::string value;
-        int flags = -1;
-        while (info >> key >> value)
-            if (key == "flags:")
-                flags = static_cast<int>(std::stol(value, nullptr, 8));
-        if (flags < 0 || (flags & O_ACCMODE) != O_RDONLY)
+        std::string key, value;
+        while (info >> key >> value && key != "flags:") {
+        }
+        if (key != "flags:" || (std::stol(value, nullptr, 8) & O_ACCMODE) != O_RDONLY)
             ++found.writable;
     }
     return found;
@@ -253,7 +239,7 @@ protected:
         child = fork();
         ASSERT_GE(child, 0);
         if (child == 0)
-            Writer(fd, images, static_cast<int64_t>(images[0].size()), *progress).run();
+            Writer{fd, images, static_cast<int64_t>(images[0].size()), *progress}.run();
         ::close(fd);
         ASSERT_EQ(chmod(file.c_str(), 0444), 0);
         for (int i = 0; i < 10'000 && !progress->started.load(); ++i)
