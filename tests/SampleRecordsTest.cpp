@@ -10,8 +10,6 @@
 #include <nlohmann/json.hpp>
 
 #include <filesystem>
-#include <fstream>
-#include <iterator>
 #include <string>
 
 namespace dovrel {
@@ -19,11 +17,7 @@ namespace {
 
 using nlohmann::json;
 using sample::StoredText;
-
-std::string ReadAll(const std::filesystem::path& path) {
-    std::ifstream in(path, std::ios::binary);
-    return {std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>()};
-}
+using test::ReadAll;
 
 // The file as the description writer makes it, without its first record.
 std::string Described(const json& description, const std::string& file, size_t recordLength) {
@@ -33,28 +27,16 @@ std::string Described(const json& description, const std::string& file, size_t r
 }
 
 TEST(SampleRecordsTest, DocumentRecordsMatchTheDescriptionWriter) {
-    json doc = {
-        {"type", 5},
-        {"account", "1001"},
-        {"customer", "משה כהן (בע\"מ)"},
-        {"address1", "רח' הרצל 45"},
-        {"address2", "תל אביב"},
-        {"reference", "4711"},
-        {"remarks", {"הערה ראשונה", "", "Remark 3"}},
-        {"date", "2019-02-28"},
-        {"discountPercent", 7.5},
-        {"vatPercent", 18},
-        {"warehouse", 3},
-        {"lines",
-         {{{"key", "A100"},
-           {"description", "מברג חשמלי"},
-           {"details", "X1"},
-           {"price", 1234.5},
-           {"quantity", 2},
-           {"discount", 12.5}},
-          {{"key", "*"}, {"description", "שורת טקסט"}},
-          {{"key", "#"}, {"description", "נסתרת"}, {"price", 99}, {"quantity", 1}},
-          {{"key", "B-200"}, {"currency", 1}, {"price", 0.1}, {"quantity", 0.5}, {"rate", 3.7}}}}};
+    json doc = json::parse(R"json({"type": 5, "account": "1001", "customer": "משה כהן (בע\"מ)",
+        "address1": "רח' הרצל 45", "address2": "תל אביב", "reference": "4711",
+        "remarks": ["הערה ראשונה", "", "Remark 3"], "date": "2019-02-28",
+        "discountPercent": 7.5, "vatPercent": 18, "warehouse": 3,
+        "lines": [{"key": "A100", "description": "מברג חשמלי", "details": "X1", "price": 1234.5,
+                   "quantity": 2, "discount": 12.5},
+                  {"key": "*", "description": "שורת טקסט"},
+                  {"key": "#", "description": "נסתרת", "price": 99, "quantity": 1},
+                  {"key": "B-200", "currency": 1, "price": 0.1, "quantity": 0.5,
+                   "rate": 3.7}]})json");
     sample::DocumentSpec spec;
     spec.type = 5;
     spec.account = StoredText("1001", 8);
@@ -79,13 +61,10 @@ TEST(SampleRecordsTest, DocumentRecordsMatchTheDescriptionWriter) {
 }
 
 TEST(SampleRecordsTest, ItemAccountAndFillerRecordsMatchTheDescriptionWriter) {
-    json item = {
-        {"key", "מק-7"}, {"name", "מקלדת"}, {"category", "07"}, {"foreignName", "Keyboard"}};
-    json account = {{"key", "1001"},
-                    {"name", "דוד לוי"},
-                    {"phone", "03-1234567"},
-                    {"district", "מרכז"},
-                    {"details", "לקוח ותיק"}};
+    json item = json::parse(
+        R"({"key": "מק-7", "name": "מקלדת", "category": "07", "foreignName": "Keyboard"})");
+    json account = json::parse(R"({"key": "1001", "name": "דוד לוי", "phone": "03-1234567",
+                                   "district": "מרכז", "details": "לקוח ותיק"})");
     std::string items = Described({{"items", {item}}}, "ITM.fix", 500);
     std::string accounts = Described({{"accounts", {account}}}, "ACT.fix", 650);
     EXPECT_EQ(items, sample::ItemRecordOf(item) + sample::FillerRecordOf(500, false));
@@ -102,24 +81,16 @@ TEST(SampleRecordsTest, FilesByTypeAndBadValues) {
     EXPECT_EQ(sample::DocumentFileOf(41), "IBD.FIX");
     EXPECT_EQ(sample::DocumentFileOf(19), "IMV.FIX");
 
-    std::string out;
-    auto fails = [&out](sample::DocumentSpec spec) {
-        out.clear();
-        EXPECT_THROW(sample::AppendDocumentRecords(spec, out), Error);
+    sample::DocumentSpec badDate, badType, badDiscount, tooManyLines;
+    badDate.month = 2, badDate.day = 30;
+    badType.type = 256;
+    badDiscount.lines = {{"A1", "", "", 21, 1, 1, 400, 1}};
+    tooManyLines.lines.resize(256);
+    for (const sample::DocumentSpec& bad : {badDate, badType, badDiscount, tooManyLines}) {
+        std::string out;
+        EXPECT_THROW(sample::AppendDocumentRecords(bad, out), Error);
         EXPECT_TRUE(out.empty());
-    };
-    sample::DocumentSpec bad;
-    bad.month = 2, bad.day = 30;
-    fails(bad);
-    bad = {};
-    bad.type = 256;
-    fails(bad);
-    bad = {};
-    bad.lines = {{"A1", "", "", 21, 1, 1, 400, 1}};
-    fails(bad);
-    bad = {};
-    bad.lines.resize(256);
-    fails(bad);
+    }
     EXPECT_THROW(sample::ItemRecordOf({{"key", "A1"}, {"price", 3}}), Error);
 }
 
