@@ -85,8 +85,7 @@ std::string MakeImage(int variant) {
             documents.push_back({{"file", "ISHP.FIX"}, {"filler", kLineSlots - lines}});
     }
     test::TestCompany company(json{{"documents", documents}}.dump());
-    std::ifstream in(company.file("ISHP.FIX"), std::ios::binary);
-    return {std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>()};
+    return test::ReadAll(company.file("ISHP.FIX"));
 }
 
 uint64_t NextRandom(uint64_t& state) {

@@ -21,8 +21,6 @@
 
 #include <algorithm>
 #include <filesystem>
-#include <fstream>
-#include <sstream>
 #include <tuple>
 
 namespace dovrel {
@@ -75,12 +73,7 @@ std::tuple<int, std::string, std::string> RunCli(const std::vector<std::string>&
         }
     }
     posix_spawn_file_actions_destroy(&files);
-    auto read = [](const std::string& path) {
-        std::ostringstream text;
-        text << std::ifstream(path, std::ios::binary).rdbuf();
-        return text.str();
-    };
-    return {code, read(out), read(err)};
+    return {code, test::ReadAll(out), test::ReadAll(err)};
 }
 
 class HostileInputTest : public ::testing::Test {

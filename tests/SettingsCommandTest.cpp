@@ -8,7 +8,6 @@
 
 #include <cstdlib>
 #include <fstream>
-#include <sstream>
 #include <string>
 #include <vector>
 
@@ -48,12 +47,8 @@ protected:
         if (posix_spawn(&pid, DOVREL_CLI, &files, nullptr, argv.data(), environ) == 0)
             waitpid(pid, &status, 0);
         posix_spawn_file_actions_destroy(&files);
-        auto read = [](const std::string& path) {
-            std::ostringstream text;
-            text << std::ifstream(path, std::ios::binary).rdbuf();
-            return text.str();
-        };
-        return {args, WIFEXITED(status) ? WEXITSTATUS(status) : -1, read(out), read(err)};
+        return {args, WIFEXITED(status) ? WEXITSTATUS(status) : -1, test::ReadAll(out),
+                test::ReadAll(err)};
     }
 
     void expect(const Step& step) {
@@ -100,8 +95,8 @@ TEST_F(SettingsCommandTest, UsageErrorsAndADamagedStoreExitWithTheirCodes) {
     std::filesystem::create_directories(config.path() / "dovrel");
     std::string file = (config.path() / "dovrel" / "settings.db").string();
     std::ofstream(file, std::ios::binary) << std::string(2000, '#');
-    expect({{"get", "CompPath"}, 1, "",
-            "dovrel: Cannot read setting \"CompPath\" from " + file + ": file is not a database\n"});
+    const std::string said = "Cannot read setting \"CompPath\" from " + file;
+    expect({{"get", "CompPath"}, 1, "", "dovrel: " + said + ": file is not a database\n"});
 }
 
 } // namespace

@@ -18,7 +18,6 @@
 #include <functional>
 #include <memory>
 #include <optional>
-#include <sstream>
 #include <thread>
 #include <type_traits>
 
@@ -133,7 +132,9 @@ protected:
     std::filesystem::path file = dir.path() / "cfg" / "dovrel" / "settings.db";
     SqliteSettingsStore store{file.string()};
 
-    std::string get(const std::string& key) { return store.GetSetting("Dovrel", "Params", key, ""); }
+    std::string get(const std::string& key) {
+        return store.GetSetting("Dovrel", "Params", key, "");
+    }
     void save(const std::string& key, const std::string& value) {
         store.SaveSetting("Dovrel", "Params", key, value);
     }
@@ -210,9 +211,7 @@ TEST_F(SqliteStoreTest, ADamagedFileOrADirectoryIsAnErrorNamingTheFile) {
                                                      file.string() + ": file is not a database"));
     for (const auto& work : everyCall())
         EXPECT_THAT(FailureOf(work), HasSubstr(file.string()));
-    std::ostringstream kept;
-    kept << std::ifstream(file, std::ios::binary).rdbuf();
-    EXPECT_EQ(kept.str(), garbage);
+    EXPECT_EQ(test::ReadAll(file), garbage);
 
     std::filesystem::remove(file);
     std::filesystem::create_directory(file);
