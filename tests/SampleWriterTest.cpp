@@ -8,9 +8,7 @@
 #include <bit>
 #include <cstdint>
 #include <filesystem>
-#include <fstream>
 #include <initializer_list>
-#include <iterator>
 #include <map>
 #include <set>
 #include <string>
@@ -19,6 +17,7 @@ namespace dovrel {
 namespace {
 
 using sample::DosVisual;
+using test::ReadAll;
 using test::TestCompany;
 
 std::string B(std::initializer_list<int> bytes) {
@@ -30,11 +29,6 @@ std::string B(std::initializer_list<int> bytes) {
 
 std::string Spaces(size_t n) {
     return std::string(n, ' ');
-}
-
-std::string ReadAll(const std::filesystem::path& path) {
-    std::ifstream in(path, std::ios::binary);
-    return {std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>()};
 }
 
 int ByteAt(const std::string& data, size_t offset) {
@@ -198,12 +192,9 @@ TEST(SampleWriter, DemoCompanyHoldsEveryDocumentType) {
     std::map<std::string, std::set<int>> typesIn;
     for (const char* name : {"ISHP.FIX", "IORDR.FIX", "IMV.FIX", "IBD.FIX"}) {
         std::string data = ReadAll(dir.path() / name);
-        for (size_t at = 170; at + 170 <= data.size(); at += 170) {
-            if (ByteAt(data, at) == 1) {
-                headers.insert(ByteAt(data, at + 1));
-                typesIn[name].insert(ByteAt(data, at + 1));
-            }
-        }
+        for (size_t at = 170; at + 170 <= data.size(); at += 170)
+            if (ByteAt(data, at) == 1)
+                typesIn[name].insert(*headers.insert(ByteAt(data, at + 1)));
     }
     EXPECT_EQ(typesIn, (std::map<std::string, std::set<int>>{
                            {"ISHP.FIX", {20, 21, 22, 23}},
