@@ -200,9 +200,7 @@ bool HalfWritten(const std::string& utf8) {
 }
 
 struct Search {
-    std::string by;
-    std::string value;  // UTF-8
-    std::string fromDate;
+    std::string by, value, fromDate;  // the value in UTF-8
 };
 
 class ConcurrentWriterTest : public ::testing::Test {
@@ -259,8 +257,7 @@ protected:
     ModuleState state;
     RecordedMessages messages;
     Card card{messages, state};
-    int found = 0;
-    int empty = 0;
+    int found = 0, empty = 0;
     int halfWritten = 0;  // scans that met a record half-written
 };
 
