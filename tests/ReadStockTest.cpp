@@ -34,6 +34,14 @@ protected:
         EXPECT_EQ(read(direction), result) << direction;
         EXPECT_EQ(box(card->txtReference1), reference) << direction;
     }
+    // Searches the lines by item key or details, in the account given or in all.
+    int32_t readLines(const std::string& by, const std::string& text, const std::string& account,
+                      const std::string& direction = "First") {
+        card->PubSearchBy = by;
+        (by == "Details" ? card->txtDetails : card->txtItemKey).setText(text);
+        card->txtAccountKey.setText(account);
+        return read(direction);
+    }
 };
 
 TEST_F(ReadStockTest, LoadsTheDocumentIntoBoxesGridAndCurrentDocument) {
@@ -78,17 +86,14 @@ TEST_F(ReadStockTest, LoadsTheDocumentIntoBoxesGridAndCurrentDocument) {
     EXPECT_DOUBLE_EQ(d.header.totalBeforeDiscount, 1000);
     EXPECT_DOUBLE_EQ(d.header.discountPercent, 10);
     EXPECT_DOUBLE_EQ(d.header.foreignTotal, (1234.5 * 2 * 0.875 + 15) * 0.9);
-    EXPECT_EQ(U(d.header.remarksLogical[0]), "הערה ראשונה");
-    EXPECT_EQ(d.header.remarksLogical[1], "");
-    EXPECT_EQ(U(d.header.remarksLogical[2]), "שלישית");
-    // Visual texts keep the stored (reversed) order.
-    EXPECT_EQ(U(d.header.customerVisual), "ןהכ השמ");
-    EXPECT_EQ(U(d.header.remarksVisual[2]), "תישילש");
-    EXPECT_EQ(d.lines[1].itemKey, "A100        ");
-    EXPECT_EQ(U(d.lines[1].descriptionVisual), "ילמשח גרבמ");
-    EXPECT_EQ(d.lines[2].itemKey, std::string(12, ' ')); // a text-only line keeps no key
-    EXPECT_EQ(U(d.lines[2].descriptionVisual), "הרושל הרעה");
-    EXPECT_EQ(d.lines[3].itemKey, "B200        ");
+    const auto& remarks = d.header.remarksLogical;
+    EXPECT_EQ(U(remarks[0] + "|" + remarks[1] + "|" + remarks[2]), "הערה ראשונה||שלישית");
+    // Visual texts keep the stored (reversed) order; a text-only line keeps no key.
+    EXPECT_EQ(U(d.header.customerVisual + "|" + d.header.remarksVisual[2]), "ןהכ השמ|תישילש");
+    EXPECT_EQ(U(d.lines[1].descriptionVisual + "|" + d.lines[2].descriptionVisual),
+              "ילמשח גרבמ|הרושל הרעה");
+    EXPECT_EQ(d.lines[1].itemKey + "|" + d.lines[2].itemKey + "|" + d.lines[3].itemKey,
+              "A100        |            |B200        ");
     // Amounts are filed under the line's own number.
     EXPECT_DOUBLE_EQ(d.amounts[1].price, 1234.5);
     EXPECT_DOUBLE_EQ(d.amounts[1].discount, 12.5);
@@ -172,9 +177,7 @@ TEST_F(ReadStockTest, ItemKeyAndDetailsSearchesStartTheGridAtTheFirstMatch) {
     b["account"] = "2002";
     write({{"documents", {Doc(20, "1", "א", {Line("K1", "one"), Line("K2", "two")}), b}}});
 
-    card->PubSearchBy = "ItemKey";
-    card->txtItemKey.setText("k2");
-    EXPECT_GT(read("First"), 0);
+    EXPECT_GT(readLines("ItemKey", "k2", ""), 0);
     EXPECT_EQ(box(card->txtReference1), "1");
     ASSERT_EQ(card->DocLines.Rows(), 3);
     EXPECT_EQ(cell(1, 0), "2");
@@ -185,28 +188,21 @@ TEST_F(ReadStockTest, ItemKeyAndDetailsSearchesStartTheGridAtTheFirstMatch) {
     EXPECT_FALSE(state.Doc.amounts[2].isZero());
 
     // The account box narrows an item search to that account.
-    card->txtItemKey.setText("K1");
-    card->txtAccountKey.setText("2002");
-    read("First");
+    readLines("ItemKey", "K1", "2002");
     EXPECT_EQ(box(card->txtReference1), "2");
     EXPECT_EQ(card->DocLines.Rows(), 5);
 
-    card->PubSearchBy = "Details";
-    card->txtDetails.setText("re");
-    card->txtAccountKey.setText("");
-    read("First");
+    readLines("Details", "re", "");
     EXPECT_EQ(box(card->txtReference1), "2");
     EXPECT_EQ(cell(1, 1), "K3");
     EXPECT_EQ(cell(2, 1), "K4");
 
-    // Backward, a document without a match is passed over once, not forever.
-    card->txtAccountKey.setText(""); // the document shown filled it in
-    card->PubSearchBy = "ItemKey";
-    card->txtItemKey.setText("K2");
-    EXPECT_GT(read("Last"), 0);
+    // Backward, a document without a match is passed over once, not forever (the account box
+    // is emptied: the document shown filled it in).
+    EXPECT_GT(readLines("ItemKey", "K2", "", "Last"), 0);
     EXPECT_EQ(box(card->txtReference1), "1");
-    card->txtItemKey.setText("none");
-    expectRead("Last", 1, "");
+    EXPECT_EQ(readLines("ItemKey", "none", "", "Last"), 1);
+    EXPECT_EQ(box(card->txtReference1), "");
 }
 
 TEST_F(ReadStockTest, FromDatePassesOverEarlierDocumentsInBothDirections) {
@@ -292,39 +288,28 @@ TEST_F(ReadStockTest, RunTimeErrorsAreReportedWithResultZero) {
     json huge = Doc(20, "6", "ו", {{{"key", "H"}, {"price", 1e300}, {"quantity", 1e300}}});
     write({{"documents", {Doc(20, "1", "א", many), nan, badNumber, zeroNumber, huge}}});
 
-    struct Case {
-        const char* name;
-        const char* reference = nullptr; // searched for when set
-        int16_t row = kDeliveryRow;
-        const char* direction = "First";
-        int32_t location = 0; // set when not 0
-        bool nullSearch = false;
-    } const cases[] = {{.name = "41 lines"},
-                       {.name = "NaN price", .reference = "3"},
-                       {.name = "line 41", .reference = "4"},
-                       {.name = "line 0", .reference = "5"},
-                       {.name = "overflow", .reference = "6"},
-                       {.name = "row -1", .row = -1},
-                       {.name = "row 42", .row = 42},
-                       {.name = "record 0", .direction = "Next", .location = -1},
-                       {.name = "direction", .direction = "Sideways"},
-                       {.name = "null search", .nullSearch = true}};
-    for (const Case& c : cases) {
-        if (c.reference)
-            search("Reference1", c.reference);
-        if (c.location)
-            card->PubACTLocation = c.location;
-        if (c.nullSearch) {
-            card->PubSearchBy = "AccountKey";
-            card->PubSearchValue = Variant::Null();
-        }
-        size_t before = messages.shown().size();
-        EXPECT_EQ(read(c.direction, c.row), 0) << c.name;
-        ASSERT_EQ(messages.shown().size(), before + 1) << c.name;
-        EXPECT_EQ(U(messages.shown().back().title), "שגיאה") << c.name;
-        EXPECT_FALSE(messages.shown().back().text.empty()) << c.name;
-        EXPECT_EQ(card->ProgressFill.Width(), 0) << c.name;
+    size_t reported = 0;
+    auto expectReported = [&](int32_t result, const std::string& what) {
+        EXPECT_EQ(result, 0) << what;
+        ASSERT_EQ(messages.shown().size(), ++reported) << what;
+        EXPECT_EQ(U(messages.shown().back().title), "שגיאה") << what;
+        EXPECT_FALSE(messages.shown().back().text.empty()) << what;
+        EXPECT_EQ(card->ProgressFill.Width(), 0) << what;
+    };
+    expectReported(read("First"), "41 lines");
+    // A NaN price, line numbers 41 and 0, an amount too large.
+    for (const char* reference : {"3", "4", "5", "6"}) {
+        search("Reference1", reference);
+        expectReported(read("First"), reference);
     }
+    expectReported(read("First", -1), "row -1");
+    expectReported(read("First", 42), "row 42");
+    card->PubACTLocation = -1;
+    expectReported(read("Next"), "record 0");
+    expectReported(read("Sideways"), "direction");
+    card->PubSearchBy = "AccountKey";
+    card->PubSearchValue = Variant::Null();
+    expectReported(read("First"), "null search");
     EXPECT_NE(lastMessage().find("Null"), std::string::npos);
 }
 
