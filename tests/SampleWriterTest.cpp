@@ -20,11 +20,8 @@ using sample::DosVisual;
 using test::ReadAll;
 using test::TestCompany;
 
-std::string B(std::initializer_list<int> bytes) {
-    std::string out;
-    for (int b : bytes)
-        out.push_back(static_cast<char>(b));
-    return out;
+std::string B(std::initializer_list<unsigned char> bytes) {
+    return {bytes.begin(), bytes.end()};
 }
 
 std::string Spaces(size_t n) {
