@@ -1,14 +1,9 @@
-#include "TestCompany.h"
+#include "RunCli.h"
 
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
 
-#include <fcntl.h>
-#include <spawn.h>
-#include <sys/wait.h>
-
 #include <cstdlib>
-#include <fstream>
 #include <sstream>
 #include <string>
 #include <tuple>
@@ -17,34 +12,7 @@
 namespace dovrel {
 namespace {
 
-// Runs the built command without a shell; its streams go through files, as a
-// pipe could fill up.
-auto RunCli(const std::vector<std::string>& args, const std::string& input = "") {
-    test::TempDir dir;
-    std::string in = (dir.path() / "in").string(), out = (dir.path() / "out").string(),
-                err = (dir.path() / "err").string();
-    std::ofstream(in, std::ios::binary) << input;
-    posix_spawn_file_actions_t files;
-    posix_spawn_file_actions_init(&files);
-    posix_spawn_file_actions_addopen(&files, 0, in.c_str(), O_RDONLY, 0);
-    posix_spawn_file_actions_addopen(&files, 1, out.c_str(), O_WRONLY | O_CREAT, 0600);
-    posix_spawn_file_actions_addopen(&files, 2, err.c_str(), O_WRONLY | O_CREAT, 0600);
-    std::vector<std::string> words{DOVREL_CLI};
-    words.insert(words.end(), args.begin(), args.end());
-    std::vector<char*> argv;
-    for (std::string& word : words)
-        argv.push_back(word.data());
-    argv.push_back(nullptr);
-    pid_t pid = 0;
-    int status = -1;
-    if (posix_spawn(&pid, DOVREL_CLI, &files, nullptr, argv.data(), environ) == 0)
-        waitpid(pid, &status, 0);
-    posix_spawn_file_actions_destroy(&files);
-    std::ostringstream outText, errText;
-    outText << std::ifstream(out, std::ios::binary).rdbuf();
-    errText << std::ifstream(err, std::ios::binary).rdbuf();
-    return std::tuple{WIFEXITED(status) ? WEXITSTATUS(status) : -1, outText.str(), errText.str()};
-}
+using test::RunCli;
 
 TEST(CliTest, ShowPrintsADocumentOfTheDemoCompany) {
     auto [code, out, err] = RunCli({"show", DOVREL_DEMO_DIR, "--type", "21", "--start", "2"});

@@ -6,17 +6,14 @@
 #include "app/cli/StateJson.h"
 #include "control/Card.h"
 #include "platform/Error.h"
+#include "RunCli.h"
 #include "TestCompany.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
 
-#include <fcntl.h>
-#include <signal.h>
-#include <spawn.h>
 #include <sys/stat.h>
-#include <sys/wait.h>
 #include <unistd.h>
 
 #include <algorithm>
@@ -42,38 +39,9 @@ json OneDocument(const std::string& reference) {
                            {"quantity", 1}}}}}}}};
 }
 
-// Runs the built command without a shell, its output in files. A command
-// still running after 30 seconds is killed and reported as exit code -2.
-std::tuple<int, std::string, std::string> RunCli(const std::vector<std::string>& args) {
-    test::TempDir dir;
-    std::string out = (dir.path() / "out").string(), err = (dir.path() / "err").string();
-    posix_spawn_file_actions_t files;
-    posix_spawn_file_actions_init(&files);
-    posix_spawn_file_actions_addopen(&files, 0, "/dev/null", O_RDONLY, 0);
-    for (auto [fd, path] : {std::pair{1, &out}, std::pair{2, &err}})
-        posix_spawn_file_actions_addopen(&files, fd, path->c_str(), O_WRONLY | O_CREAT, 0600);
-    std::vector<std::string> words{DOVREL_CLI};
-    words.insert(words.end(), args.begin(), args.end());
-    std::vector<char*> argv;
-    for (std::string& word : words)
-        argv.push_back(word.data());
-    argv.push_back(nullptr);
-    pid_t pid = 0;
-    int status = -1;
-    int code = -1;
-    if (posix_spawn(&pid, DOVREL_CLI, &files, nullptr, argv.data(), environ) == 0) {
-        for (int waited = 0; waited < 3000 && waitpid(pid, &status, WNOHANG) == 0; ++waited)
-            usleep(10'000);
-        if (waitpid(pid, &status, WNOHANG) == 0) {
-            kill(pid, SIGKILL);
-            waitpid(pid, &status, 0);
-            code = -2;
-        } else if (WIFEXITED(status)) {
-            code = WEXITSTATUS(status);
-        }
-    }
-    posix_spawn_file_actions_destroy(&files);
-    return {code, test::ReadAll(out), test::ReadAll(err)};
+// A command that hangs on a hostile path is killed after 30 seconds (-2).
+test::CliResult RunCli(const std::vector<std::string>& args) {
+    return test::RunCli(args, "", 30);
 }
 
 class HostileInputTest : public ::testing::Test {

@@ -1,10 +1,8 @@
+#include "RunCli.h"
 #include "TestCompany.h"
 
 #include <gtest/gtest.h>
 
-#include <fcntl.h>
-#include <spawn.h>
-#include <sys/wait.h>
 
 #include <cstdlib>
 #include <fstream>
@@ -27,28 +25,11 @@ protected:
     test::TempDir config, streams;
 
     Step run(const std::vector<std::string>& args) {
-        std::string out = (streams.path() / "out").string(),
-                    err = (streams.path() / "err").string();
-        posix_spawn_file_actions_t files;
-        posix_spawn_file_actions_init(&files);
-        posix_spawn_file_actions_addopen(&files, 0, "/dev/null", O_RDONLY, 0);
-        for (auto [fd, path] : {std::pair{1, &out}, std::pair{2, &err}})
-            posix_spawn_file_actions_addopen(&files, fd, path->c_str(),
-                                             O_WRONLY | O_CREAT | O_TRUNC, 0600);
-        std::vector<std::string> words{DOVREL_CLI, "settings"};
-        words.insert(words.end(), args.begin(), args.end());
-        std::vector<char*> argv;
-        for (std::string& word : words)
-            argv.push_back(word.data());
-        argv.push_back(nullptr);
         setenv("XDG_CONFIG_HOME", config.str().c_str(), 1);
-        pid_t pid = 0;
-        int status = -1;
-        if (posix_spawn(&pid, DOVREL_CLI, &files, nullptr, argv.data(), environ) == 0)
-            waitpid(pid, &status, 0);
-        posix_spawn_file_actions_destroy(&files);
-        return {args, WIFEXITED(status) ? WEXITSTATUS(status) : -1, test::ReadAll(out),
-                test::ReadAll(err)};
+        std::vector<std::string> words{"settings"};
+        words.insert(words.end(), args.begin(), args.end());
+        test::CliResult result = test::RunCli(words);
+        return {args, result.code, result.out, result.err};
     }
 
     void expect(const Step& step) {
