@@ -37,25 +37,25 @@ TEST(SampleRecordsTest, DocumentRecordsMatchTheDescriptionWriter) {
                   {"key": "#", "description": "נסתרת", "price": 99, "quantity": 1},
                   {"key": "B-200", "currency": 1, "price": 0.1, "quantity": 0.5,
                    "rate": 3.7}]})json");
-    sample::DocumentSpec spec;
-    spec.type = 5;
-    spec.account = StoredText("1001", 8);
-    spec.customer = StoredText("משה כהן (בע\"מ)", 30);
-    spec.address1 = StoredText("רח' הרצל 45", 30);
-    spec.address2 = StoredText("תל אביב", 30);
-    spec.reference = StoredText("4711", 5);
-    spec.remarks = {StoredText("הערה ראשונה", 48), "", StoredText("Remark 3", 48)};
-    spec.year = 2019, spec.month = 2, spec.day = 28;
-    spec.discountPercent = 7.5;
-    spec.vatPercent = 18;
-    spec.warehouse = 3;
-    spec.lines = {
+    sample::DocumentData data;
+    data.type = 5;
+    data.account = StoredText("1001", 8);
+    data.customer = StoredText("משה כהן (בע\"מ)", 30);
+    data.address1 = StoredText("רח' הרצל 45", 30);
+    data.address2 = StoredText("תל אביב", 30);
+    data.reference = StoredText("4711", 5);
+    data.remarks = {StoredText("הערה ראשונה", 48), "", StoredText("Remark 3", 48)};
+    data.year = 2019, data.month = 2, data.day = 28;
+    data.discountPercent = 7.5;
+    data.vatPercent = 18;
+    data.warehouse = 3;
+    data.lines = {
         {StoredText("A100", 12), StoredText("מברג חשמלי", 40), "X1", 21, 1234.5, 2, 12.5, 1},
         {"*", StoredText("שורת טקסט", 40), "", 21, 0, 0, 0, 1},
         {"#", StoredText("נסתרת", 40), "", 21, 99, 1, 0, 1},
         {"B-200", "", "", 1, 0.1, 0.5, 0, 3.7}};
     std::string records;
-    sample::AppendDocumentRecords(spec, records);
+    sample::AppendDocumentRecords(data, records);
     EXPECT_EQ(records, Described({{"documents", {doc}}}, "IMV.FIX", 170));
     EXPECT_EQ(records.size(), 6u * 170);
 }
@@ -81,12 +81,12 @@ TEST(SampleRecordsTest, FilesByTypeAndBadValues) {
     EXPECT_EQ(sample::DocumentFileOf(41), "IBD.FIX");
     EXPECT_EQ(sample::DocumentFileOf(19), "IMV.FIX");
 
-    sample::DocumentSpec badDate, badType, badDiscount, tooManyLines;
+    sample::DocumentData badDate, badType, badDiscount, tooManyLines;
     badDate.month = 2, badDate.day = 30;
     badType.type = 256;
     badDiscount.lines = {{"A1", "", "", 21, 1, 1, 400, 1}};
     tooManyLines.lines.resize(256);
-    for (const sample::DocumentSpec& bad : {badDate, badType, badDiscount, tooManyLines}) {
+    for (const sample::DocumentData& bad : {badDate, badType, badDiscount, tooManyLines}) {
         std::string out;
         EXPECT_THROW(sample::AppendDocumentRecords(bad, out), Error);
         EXPECT_TRUE(out.empty());

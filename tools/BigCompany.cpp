@@ -221,7 +221,7 @@ const std::string_view kDocumentFiles[] = {"ISHP.FIX", "IORDR.FIX", "IMV.FIX", "
 
 // The date of a document that far through its file: the documents of ten
 // years in the order they were written.
-void SetDate(DocumentSpec& doc, double fraction) {
+void SetDate(DocumentData& doc, double fraction) {
     using namespace std::chrono;
     auto first = sys_days(year(kFirstYear) / January / 1);
     auto days = static_cast<int>(fraction * 365.25 * kYears);
@@ -231,8 +231,8 @@ void SetDate(DocumentSpec& doc, double fraction) {
     doc.day = static_cast<int>(static_cast<unsigned>(date.day()));
 }
 
-LineSpec MakeLine(const BigCompanyPools& pools, Random& rng) {
-    LineSpec line;
+LineData MakeLine(const BigCompanyPools& pools, Random& rng) {
+    LineData line;
     uint64_t kind = rng.below(100);
     if (kind < 5) { // a text-only line
         line.key = "*";
@@ -257,9 +257,9 @@ LineSpec MakeLine(const BigCompanyPools& pools, Random& rng) {
     return line;
 }
 
-DocumentSpec MakeDocument(const BigCompanyPools& pools, Random& rng, int type, int number,
+DocumentData MakeDocument(const BigCompanyPools& pools, Random& rng, int type, int number,
                           double fraction) {
-    DocumentSpec doc;
+    DocumentData doc;
     doc.type = type;
     const BigCompanyPools::Account& account = pools.accounts[rng.skewed(pools.accounts.size())];
     doc.account = account.key;

@@ -919,7 +919,7 @@ void CheckByte(int value, const std::string& what) {
         throw Error(what + ": expected a whole number from 0 to 255");
 }
 
-LineFields LineFieldsOf(const LineSpec& line, int docType, int lineNumber) {
+LineFields LineFieldsOf(const LineData& line, int docType, int lineNumber) {
     CheckByte(line.currency, "line currency");
     LineFields f;
     f.key = line.key;
@@ -940,7 +940,7 @@ LineFields LineFieldsOf(const LineSpec& line, int docType, int lineNumber) {
     return f;
 }
 
-std::string DateBytesOf(const DocumentSpec& doc) {
+std::string DateBytesOf(const DocumentData& doc) {
     std::chrono::year_month_day date{std::chrono::year(doc.year),
                                      std::chrono::month(static_cast<unsigned>(doc.month)),
                                      std::chrono::day(static_cast<unsigned>(doc.day))};
@@ -951,7 +951,7 @@ std::string DateBytesOf(const DocumentSpec& doc) {
             static_cast<char>(doc.day)};
 }
 
-DocumentFields FieldsOf(const DocumentSpec& doc, double linesTotal) {
+DocumentFields FieldsOf(const DocumentData& doc, double linesTotal) {
     CheckByte(doc.type, "document type");
     CheckByte(doc.warehouse, "warehouse");
     DocumentFields f;
@@ -982,7 +982,7 @@ std::string DocumentFileOf(int type) {
     return FileOfType(type);
 }
 
-void AppendDocumentRecords(const DocumentSpec& doc, std::string& out) {
+void AppendDocumentRecords(const DocumentData& doc, std::string& out) {
     if (doc.lines.size() > 255)
         throw Error("a document holds at most 255 line records");
     std::vector<std::string> lines;

@@ -40,7 +40,7 @@ std::string StoredText(std::string_view utf8, size_t width, Order order = Order:
 
 // Texts hold stored bytes (StoredText); a shorter one is padded with spaces,
 // a longer one cut.
-struct LineSpec {
+struct LineData {
     std::string key, description, details;
     int currency = 21;
     double price = 0;
@@ -51,7 +51,7 @@ struct LineSpec {
 
 // A document whose lines are numbered from 1 and all belong to its type;
 // totals are computed as for a description that leaves them out.
-struct DocumentSpec {
+struct DocumentData {
     int type = 20;
     std::string account, customer, address1, address2, reference;
     std::array<std::string, 3> remarks;
@@ -59,13 +59,13 @@ struct DocumentSpec {
     double discountPercent = 0;
     double vatPercent = 17;
     int warehouse = 1;
-    std::vector<LineSpec> lines; // at most 255
+    std::vector<LineData> lines; // at most 255
 };
 
 // "ISHP.FIX", "IORDR.FIX", "IMV.FIX" or "IBD.FIX": the file of the type.
 std::string DocumentFileOf(int type);
 // Appends the document's header, continuation and line records to out.
-void AppendDocumentRecords(const DocumentSpec& doc, std::string& out);
+void AppendDocumentRecords(const DocumentData& doc, std::string& out);
 // One record of ITM.fix or ACT.fix from an entry of the "items" or
 // "accounts" list; record 1 and the closing record are FillerRecord.
 std::string ItemRecordOf(const nlohmann::json& item);
