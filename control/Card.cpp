@@ -176,24 +176,28 @@ void Card::CompanyTitle(const Variant& value) {
     shared_.Company.setTitle(value.toText());
 }
 
-void Card::selectDocType(int16_t pWizFile) {
+// The first steps of ShowDoc and SetParams: the document type, the company
+// path (its change handling runs when it differs), no search, and the
+// position just before the record to start at.
+void Card::prepareShow(const std::string& pCompPath, int16_t pWizFile, int32_t pStartPosition) {
     cmbDocType.setListIndex(DocTypeIndex(shared_.DocTypes, pWizFile));
-}
-
-int32_t Card::ShowDoc(std::string pCompPath, int16_t& pWizFile, int32_t& pStartPosition) {
-    std::string dbPath = shared_.DBPath, picPath = shared_.PicPath;
-    return SetParams(std::move(pCompPath), pWizFile, pStartPosition, dbPath, picPath);
-}
-
-int32_t Card::SetParams(std::string pCompPath, int16_t& pWizFile, int32_t& pStartPosition,
-                        std::string& pDBPath, std::string& pPicPath) {
-    selectDocType(pWizFile);
     shared_.CompDir = pCompPath;
     txtCompPath.setText(pCompPath);
     clearSearch();
     if (pStartPosition == std::numeric_limits<int32_t>::min())
         throw Error("Overflow");
     PubACTLocation = pStartPosition - 1;
+}
+
+int32_t Card::ShowDoc(std::string pCompPath, int16_t& pWizFile, int32_t& pStartPosition) {
+    prepareShow(pCompPath, pWizFile, pStartPosition);
+    readWith("Next");
+    return 0;
+}
+
+int32_t Card::SetParams(std::string pCompPath, int16_t& pWizFile, int32_t& pStartPosition,
+                        std::string& pDBPath, std::string& pPicPath) {
+    prepareShow(pCompPath, pWizFile, pStartPosition);
     shared_.DBPath = pDBPath;
     shared_.PicPath = pPicPath;
     readWith("Next");

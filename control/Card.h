@@ -134,7 +134,7 @@ private:
     void search(const char* by, const std::string& value);
     void clearSearch();
     void resetPosition();
-    void selectDocType(int16_t pWizFile);
+    void prepareShow(const std::string& pCompPath, int16_t pWizFile, int32_t pStartPosition);
     Form& form(const std::string& name);
 
     std::unique_ptr<OwnServices> own_;

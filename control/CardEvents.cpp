@@ -13,56 +13,46 @@ namespace dovrel {
 namespace {
 
 using Handler = void (Card::*)();
+using HandlerTable = std::initializer_list<std::pair<const char*, Handler>>;
 
-// The handler of the named control for one kind of event, or nullptr.
-Handler Find(std::initializer_list<std::pair<const char*, Handler>> table,
-             const std::string& name) {
+// Runs the handler the table gives the named control for one kind of event;
+// a control without one ignores the event, an unknown name is an error.
+void Raise(Card& card, const std::string& name, HandlerTable table) {
+    if (card.findControl(name) == nullptr)
+        throw Error("Unknown control: " + name);
     for (const auto& [control, handler] : table)
         if (name == control)
-            return handler;
-    return nullptr;
+            return (card.*handler)();
 }
 
 } // namespace
 
 void Card::Click(const std::string& name) {
-    if (findControl(name) == nullptr)
-        throw Error("Unknown control: " + name);
-    Handler handler = Find({{"FirstButt", &Card::FirstButt_Click},
-                            {"PrevButt", &Card::PrevButt_Click},
-                            {"NextButt", &Card::NextButt_Click},
-                            {"LastButt", &Card::LastButt_Click},
-                            {"lblDetails", &Card::lblDetails_Click},
-                            {"CmdDir", &Card::CmdDir_Click},
-                            {"CmdParams", &Card::CmdParams_Click},
-                            {"cmdAccount", &Card::cmdAccount_Click},
-                            {"cmdSaveDef", &Card::cmdSaveDef_Click},
-                            {"PrintButt", &Card::PrintButt_Click}},
-                           name);
-    if (handler)
-        (this->*handler)();
+    Raise(*this, name,
+          {{"FirstButt", &Card::FirstButt_Click},
+           {"PrevButt", &Card::PrevButt_Click},
+           {"NextButt", &Card::NextButt_Click},
+           {"LastButt", &Card::LastButt_Click},
+           {"lblDetails", &Card::lblDetails_Click},
+           {"CmdDir", &Card::CmdDir_Click},
+           {"CmdParams", &Card::CmdParams_Click},
+           {"cmdAccount", &Card::cmdAccount_Click},
+           {"cmdSaveDef", &Card::cmdSaveDef_Click},
+           {"PrintButt", &Card::PrintButt_Click}});
 }
 
 void Card::DblClick(const std::string& name) {
-    if (findControl(name) == nullptr)
-        throw Error("Unknown control: " + name);
-    Handler handler = Find({{"Label1", &Card::Label1_DblClick},
-                            {"LblReference1", &Card::LblReference1_DblClick},
-                            {"Label2", &Card::Label2_DblClick},
-                            {"lblItemKey", &Card::lblItemKey_DblClick}},
-                           name);
-    if (handler)
-        (this->*handler)();
+    Raise(*this, name,
+          {{"Label1", &Card::Label1_DblClick},
+           {"LblReference1", &Card::LblReference1_DblClick},
+           {"Label2", &Card::Label2_DblClick},
+           {"lblItemKey", &Card::lblItemKey_DblClick}});
 }
 
 void Card::LostFocus(const std::string& name) {
-    if (findControl(name) == nullptr)
-        throw Error("Unknown control: " + name);
-    Handler handler = Find(
-        {{"cmbDocType", &Card::cmbDocType_LostFocus}, {"CmbDocLang", &Card::CmbDocLang_LostFocus}},
-        name);
-    if (handler)
-        (this->*handler)();
+    Raise(
+        *this, name,
+        {{"cmbDocType", &Card::cmbDocType_LostFocus}, {"CmbDocLang", &Card::CmbDocLang_LostFocus}});
 }
 
 void Card::readWith(const char* direction) {
