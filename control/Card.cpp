@@ -17,19 +17,13 @@ struct Card::OwnServices {
     MemorySettingsStore settings;
     ClosingFormPresenter forms;
     MemoryClipboard clipboard;
+    RecordingBrowser browser;
+    SystemClock clock;
 };
 
-namespace {
-
-[[noreturn]] void NotAvailable(const char* member) {
-    throw Error(std::string(member) + " is not available yet");
-}
-
-} // namespace
-
 Card::Card(Messages& messages, ModuleState& shared)
-    : own_(std::make_unique<OwnServices>()), services_{messages, own_->settings, own_->forms,
-                                                       own_->clipboard},
+    : own_(std::make_unique<OwnServices>()), services_{messages,        own_->settings, own_->forms,
+                                                       own_->clipboard, own_->browser, own_->clock},
       shared_(shared) {
     buildControls();
 }
@@ -164,10 +158,6 @@ int32_t Card::ReadStock(std::string pCompPath, int16_t& pWizFile, std::string& p
                              pStartFrom, pFromDate);
 }
 
-void Card::CreateHTML(std::string&, int16_t&) {
-    NotAvailable("CreateHTML");
-}
-
 Variant Card::CompanyTitle() const {
     return Variant(shared_.Company.title());
 }
@@ -224,28 +214,8 @@ Variant Card::ReadITM(std::string& CompPath) {
     return dovrel::ReadITM(CompPath, shared_.Doc, {ProgressFrame, ProgressFill});
 }
 
-void Card::FillPicPath(std::string&) {
-    NotAvailable("FillPicPath");
-}
-
-void Card::CreateHTMLEng(std::string&, bool&) {
-    NotAvailable("CreateHTMLEng");
-}
-
-std::string Card::CreateAsIs(std::string&) {
-    NotAvailable("CreateAsIs");
-}
-
 Variant Card::ReadACT(std::string& CompPath) {
     return dovrel::ReadACT(CompPath, shared_.Accounts, {ProgressFrame, ProgressFill});
-}
-
-void Card::WriteCell(int16_t&, std::string&) {
-    NotAvailable("WriteCell");
-}
-
-std::string Card::RulesValue() {
-    NotAvailable("RulesValue");
 }
 
 Form& Card::form(const std::string& name) {

@@ -2,7 +2,9 @@
 
 #include "control/ModuleState.h"
 #include "fixfiles/DocumentView.h"
+#include "platform/Browser.h"
 #include "platform/Clipboard.h"
+#include "platform/Clock.h"
 #include "platform/Container.h"
 #include "platform/Form.h"
 #include "platform/Messages.h"
@@ -23,6 +25,8 @@ struct CardServices {
     SettingsStore& settings;
     FormPresenter& forms;
     Clipboard& clipboard;
+    Browser& browser;
+    const Clock& clock;
 };
 
 // The viewer control. It shows one document of the accounting system at a
@@ -33,7 +37,8 @@ struct CardServices {
 class Card : public DocumentView {
 public:
     // A control with its own headless services: settings kept in memory,
-    // forms closed at once, a private clipboard; messages must outlive it.
+    // forms closed at once, a private clipboard, pages kept unopened, the
+    // system's date; messages must outlive it.
     explicit Card(Messages& messages, ModuleState& shared = ModuleState::ofThisThread());
     explicit Card(const CardServices& services, ModuleState& shared = ModuleState::ofThisThread());
     ~Card() override;

@@ -147,43 +147,10 @@ void Card::txtCompPath_Change() {
     clearSearch();
 }
 
-void Card::CmdDir_Click() {
-    services_.forms.ShowModal(form("frmOpenDir"));
-    txtCompPath.setText(shared_.CompDir);
-    txtCompPath_Change();
-}
-
-void Card::CmdParams_Click() {
-    services_.forms.ShowModal(form("frmItemPics"));
-}
-
 void Card::cmdSaveDef_Click() {
     uint8_t save = 1;
     SetGetRegParams(save);
     shared_.CompDir = txtCompPath.Text();
-}
-
-// Shows the details of the account in the account box, loading the accounts
-// file when it was not loaded yet, and once more when the key is not in it.
-// Every failing step is skipped.
-void Card::cmdAccount_Click() {
-    std::string key(Trim(txtAccountKey.Text()));
-    if (key.empty())
-        return;
-    AccountsTable& accounts = shared_.Accounts;
-    std::string compDir = shared_.CompDir;
-    if (!accounts.AccountsLoaded)
-        IgnoringErrors([&] { ReadACT(compDir); });
-    IgnoringErrors([&] { accounts.CurrentAccount = FindAccount(accounts, key); });
-    if (accounts.CurrentAccount.Key.empty()) {
-        IgnoringErrors([&] { ReadACT(compDir); });
-        IgnoringErrors([&] { accounts.CurrentAccount = FindAccount(accounts, key); });
-    }
-    IgnoringErrors([&] { services_.forms.ShowModal(form("frmAccDetails")); });
-}
-
-void Card::PrintButt_Click() {
-    throw Error("Printing is not available yet");
 }
 
 } // namespace dovrel

@@ -10,8 +10,7 @@ namespace dovrel {
 class Card;
 
 // Makes the side form of the given name ("frmOpenDir", "frmItemPics",
-// "frmAccDetails") for the control that first opens it. A form that has
-// no controls of its own yet is an empty window.
+// "frmAccDetails") for the control that first opens it.
 std::unique_ptr<Form> MakeCardForm(const std::string& name, Card& card);
 
 } // namespace dovrel

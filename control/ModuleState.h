@@ -28,6 +28,12 @@ struct ModuleState {
     // in a separator.
     std::string DBPath;
     std::string PicPath;
+    // The printed page's logo file, company title and picture size, kept by
+    // the picture settings form.
+    std::string LogoFile;
+    std::string CompTitle;
+    std::string PicX;
+    std::string PicY;
     // The side forms by name, each made on first use and kept.
     std::map<std::string, std::unique_ptr<Form>> Forms;
 

@@ -71,7 +71,9 @@ protected:
     MemorySettingsStore settings;
     RecordingForms forms;
     MemoryClipboard clipboard;
-    CardServices services{messages, settings, forms, clipboard};
+    RecordingBrowser browser;
+    FixedClock clock{{2026, 12, 6}};
+    CardServices services{messages, settings, forms, clipboard, browser, clock};
     ModuleState state;
 };
 

@@ -57,7 +57,7 @@ void HostSession::newCard(size_t slot, const json& elements) {
         if (!value.is_null())
             values[id] = value.is_string() ? HostArgs::Text(value, id) : value.dump();
     ElementsContainer container(std::move(values));
-    CardServices services{messages_, *settings_, forms_, clipboard_};
+    CardServices services{messages_, *settings_, forms_, clipboard_, browser_, clock_};
     cards_[slot] = std::make_unique<Card>(services, shared_);
     current_ = slot;
     cards_[slot]->UserControl_InitProperties(&container);

@@ -4,7 +4,9 @@
 #include "app/cli/HostForms.h"
 #include "control/Card.h"
 #include "control/ModuleState.h"
+#include "platform/Browser.h"
 #include "platform/Clipboard.h"
+#include "platform/Clock.h"
 #include "platform/Messages.h"
 #include "platform/SettingsStore.h"
 
@@ -54,6 +56,9 @@ public:
     Card& card() { return *cards_[current_]; }
     RecordedMessages& messages() { return messages_; }
     MemoryClipboard& clipboard() { return clipboard_; }
+    RecordingBrowser& browser() { return browser_; }
+    // Fixes today's date of the pages.
+    void setToday(CivilDate today) { clock_.fix(today); }
     HostForms& forms() { return forms_; }
 
 private:
@@ -68,6 +73,8 @@ private:
     RecordedMessages messages_;
     std::unique_ptr<SettingsStore> settings_;
     MemoryClipboard clipboard_;
+    RecordingBrowser browser_;
+    SettableClock clock_;
     HostForms forms_;
     ModuleState& shared_;
     std::array<std::unique_ptr<Card>, 2> cards_;

@@ -1,6 +1,7 @@
 #include "app/cli/HostSession.h"
 #include "app/cli/SettingsCommand.h"
 #include "app/cli/ShowCommand.h"
+#include "app/cli/Subcommands.h"
 
 #include <CLI/CLI.hpp>
 
@@ -13,7 +14,7 @@
 
 namespace {
 
-using Runner = std::function<int()>;
+using dovrel::Runner;
 
 // Each sub-command registers its options and, when chosen, the work to run.
 void AddShow(CLI::App& app, Runner& run) {
@@ -79,6 +80,10 @@ int main(int argc, char** argv) {
     AddShow(app, run);
     AddHost(app, run);
     AddSettings(app, run);
+    dovrel::AddPrint(app, run);
+    dovrel::AddCompanies(app, run);
+    dovrel::AddAccount(app, run);
+    dovrel::AddPictures(app, run);
     try {
         app.parse(argc, argv);
     } catch (const CLI::ParseError& e) {
