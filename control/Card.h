@@ -17,7 +17,10 @@
 
 namespace dovrel {
 
+class PageFile;
 class SettingsStore;
+struct PageSettings;
+struct PageView;
 
 // The outside services a control uses; all must outlive it.
 struct CardServices {
@@ -131,6 +134,7 @@ public:
 
 private:
     struct OwnServices;
+    class OpenPage;
 
     void buildControls();
     Control* ownControl(const std::string& name);
@@ -141,12 +145,15 @@ private:
     void resetPosition();
     void prepareShow(const std::string& pCompPath, int16_t pWizFile, int32_t pStartPosition);
     Form& form(const std::string& name);
+    PageSettings preparePage();
+    PageView pageView(std::string title);
 
     std::unique_ptr<OwnServices> own_;
     CardServices services_;
     ModuleState& shared_;
     std::vector<std::unique_ptr<Control>> plain_; // labels, buttons, frames
     std::vector<Control*> controls_;
+    PageFile* openPage_ = nullptr; // the page being built, for WriteCell
 };
 
 } // namespace dovrel

@@ -1,39 +1,129 @@
 #include "control/Card.h"
 
+#include "fixfiles/CompanyFile.h"
+#include "pages/DocumentPage.h"
+#include "pages/Html.h"
+#include "pages/PageFile.h"
+#include "pictures/ItemPicsForm.h"
+#include "platform/Encoding.h"
 #include "platform/Error.h"
 
 namespace dovrel {
 
 namespace {
 
-[[noreturn]] void NotAvailable(const char* member) {
-    throw Error(std::string(member) + " is not available yet");
-}
+// The number under which WriteCell finds the page being built.
+constexpr int16_t kPageFileNumber = 1;
 
 } // namespace
 
-void Card::CreateHTML(std::string&, int16_t&) {
-    NotAvailable("CreateHTML");
+// While a page is built, WriteCell writes to it under its file number.
+class Card::OpenPage {
+public:
+    OpenPage(Card& card, PageFile& page) : card_(card) { card_.openPage_ = &page; }
+    ~OpenPage() { card_.openPage_ = nullptr; }
+    OpenPage(const OpenPage&) = delete;
+    OpenPage& operator=(const OpenPage&) = delete;
+
+private:
+    Card& card_;
+};
+
+// The settings form holds the page settings; the picture database and
+// picture folders are taken from its boxes as they are now, and the lines'
+// pictures looked up before the page is written.
+PageSettings Card::preparePage() {
+    auto& pics = dynamic_cast<ItemPicsForm&>(form("frmItemPics"));
+    shared_.DBPath = pics.txtDBPath.Text();
+    std::string database = shared_.DBPath + "Dovrel.def";
+    FillPicPath(database);
+    shared_.PicPath = pics.txtPicPath.Text();
+    return {shared_.LogoFile, shared_.CompTitle, shared_.PicPath, shared_.PicX, shared_.PicY};
 }
 
-void Card::CreateHTMLEng(std::string&, bool&) {
-    NotAvailable("CreateHTMLEng");
+PageView Card::pageView(std::string title) {
+    PageView view(DocLines);
+    view.title = std::move(title);
+    view.reference = txtReference1.Text();
+    view.date = txtDate.Text();
+    view.customer = txtCustomerName.Text();
+    view.address1 = txtAddress1.Text();
+    view.address2 = txtAddress2.Text();
+    view.totalVat = txtTotalVat.Text();
+    view.vatValue = txtVatValue.Text();
+    view.total1 = txtTotal1.Text();
+    view.rules = RulesValue();
+    view.drawings = ChkWithDrawing.Value() == 1;
+    view.lineDiscount = chkLineDisc.Value() == 1;
+    view.details = ChkShowDetails.Value() == 1;
+    view.showTotalFC = ChkShowTotalFC.Value() == 1;
+    return view;
 }
 
-std::string Card::CreateAsIs(std::string&) {
-    NotAvailable("CreateAsIs");
+void Card::CreateHTML(std::string& pFileName, int16_t& pDocFormat) {
+    PageSettings settings = preparePage();
+    PageView view = pageView(txtTitle.Text().empty() ? cmbDocType.Text() : txtTitle.Text());
+    PageContext context{view, shared_.Doc, settings, services_.clock.Today(), pDocFormat};
+    PageFile page(pFileName);
+    OpenPage open(*this, page);
+    WriteHebrewPage(page, context);
+    page.commit();
 }
 
-void Card::WriteCell(int16_t&, std::string&) {
-    NotAvailable("WriteCell");
+void Card::CreateHTMLEng(std::string& pFileName, bool& pUseFName) {
+    PageSettings settings = preparePage();
+    std::string title = txtTitle.Text();
+    if (title.empty()) {
+        int32_t row = cmbDocType.ListIndex();
+        if (row < 0 || row >= kDocTypeRows)
+            throw Error("There is no document type chosen to take the English title from");
+        title = shared_.DocTypes[static_cast<size_t>(row)].englishTitle;
+    }
+    PageView view = pageView(std::move(title));
+    PageContext context{view, shared_.Doc, settings, services_.clock.Today(), kPricedPage};
+    PageFile page(pFileName);
+    WriteEnglishPage(page, context, pUseFName, shared_.Company);
+    page.commit();
+}
+
+std::string Card::CreateAsIs(std::string& pText) {
+    return AsIsTable(pText);
+}
+
+void Card::WriteCell(int16_t& MyNum, std::string& CellValue) {
+    if (MyNum != kPageFileNumber || openPage_ == nullptr)
+        throw Error("Bad file name or number");
+    if (CellValue.empty())
+        CellValue = "&nbsp;";
+    openPage_->line(RightCell(CellValue));
 }
 
 std::string Card::RulesValue() {
-    NotAvailable("RulesValue");
+    return RulesFor(cmbRules.ListIndex());
 }
 
+// Writes the page the language list asks for into this user's print file
+// and opens it in the browser. With no language chosen nothing is written
+// and nothing opened. A failure is shown as a message and opens nothing.
 void Card::PrintButt_Click() {
-    throw Error("Printing is not available yet");
+    try {
+        std::string compDir = shared_.CompDir;
+        ReadAdf(compDir, shared_.Company);
+        if (ChkWithDrawing.Value() == 1 || ChkUseFName.Value() == 1)
+            ReadITM(compDir);
+        std::string path;
+        int16_t format = kPricedPage;
+        bool useForeignNames = ChkUseFName.Value() == 1;
+        switch (CmbDocLang.ListIndex()) {
+        case 0: path = PrintFilePath(); CreateHTML(path, format); break;
+        case 1: path = PrintFilePath(); CreateHTMLEng(path, useForeignNames); break;
+        case 2: path = PrintFilePath(); format = kPageWithoutAmounts; CreateHTML(path, format); break;
+        default: return;
+        }
+        services_.browser.Open(path);
+    } catch (const std::exception& e) {
+        services_.messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("תקלה"), e.what());
+    }
 }
 
 } // namespace dovrel
