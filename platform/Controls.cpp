@@ -2,6 +2,8 @@
 
 #include "platform/Error.h"
 
+#include <algorithm>
+
 namespace dovrel {
 
 const std::string& ComboBox::List(int32_t index) const {
@@ -29,6 +31,23 @@ void ComboBox::setListIndex(int32_t index) {
 
 std::string ComboBox::Text() const {
     return index_ < 0 ? std::string() : entries_[static_cast<size_t>(index_)];
+}
+
+void TextBox::setSelStart(int32_t start) {
+    if (start < 0)
+        throw Error("Invalid selection start " + std::to_string(start) + " for " + name());
+    selStart_ = std::min(start, static_cast<int32_t>(text_.size()));
+    selLength_ = std::min(selLength_, static_cast<int32_t>(text_.size()) - selStart_);
+}
+
+void TextBox::setSelLength(int32_t length) {
+    if (length < 0)
+        throw Error("Invalid selection length " + std::to_string(length) + " for " + name());
+    selLength_ = std::min(length, static_cast<int32_t>(text_.size()) - selStart_);
+}
+
+std::string TextBox::SelText() const {
+    return text_.substr(static_cast<size_t>(selStart_), static_cast<size_t>(selLength_));
 }
 
 void CheckBox::setValue(int32_t value) {

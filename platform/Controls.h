@@ -13,7 +13,18 @@ namespace dovrel {
 // binds real widgets to them and adds nothing to the logic. Texts are code
 // page 1255 bytes.
 
-enum class ControlKind { TextBox, ComboBox, CheckBox, Label, Shape, Button, Grid };
+enum class ControlKind {
+    TextBox,
+    ComboBox,
+    CheckBox,
+    Label,
+    Shape,
+    Button,
+    Grid,
+    ListBox,   // a list shown open, entries one per line
+    DriveList, // a drop-down of the mounted file systems
+    DirList    // a directory tree showing one path
+};
 
 class Control {
 public:
@@ -35,7 +46,8 @@ private:
 };
 
 // A text box. Setting a different text announces the change, as typing would;
-// setting the same text does nothing.
+// setting the same text does nothing. The selection is a start and a length
+// in bytes; a new text leaves nothing selected, with the caret at the start.
 class TextBox : public Control {
 public:
     explicit TextBox(std::string name, std::string text = {})
@@ -46,13 +58,26 @@ public:
         if (text == text_)
             return;
         text_ = std::move(text);
+        selStart_ = 0;
+        selLength_ = 0;
         changed();
     }
+
+    int32_t SelStart() const { return selStart_; }
+    int32_t SelLength() const { return selLength_; }
+    // A start past the end moves to the end; a length past the end stops
+    // there. Negative values are refused with an error.
+    void setSelStart(int32_t start);
+    void setSelLength(int32_t length);
+    // The selected part of the text.
+    std::string SelText() const;
 
     Signal<> changed;
 
 private:
     std::string text_;
+    int32_t selStart_ = 0;
+    int32_t selLength_ = 0;
 };
 
 // A rectangle shape; the progress bar is two of them, and only the width of
@@ -89,7 +114,8 @@ namespace dovrel {
 // A position outside the list is refused with an error, as the list would.
 class ComboBox : public Control {
 public:
-    explicit ComboBox(std::string name) : Control(std::move(name), ControlKind::ComboBox) {}
+    explicit ComboBox(std::string name, ControlKind kind = ControlKind::ComboBox)
+        : Control(std::move(name), kind) {}
 
     int32_t ListCount() const { return static_cast<int32_t>(entries_.size()); }
     const std::string& List(int32_t index) const;

@@ -4,6 +4,7 @@
 #include "app/cli/StateJson.h"
 #include "platform/Encoding.h"
 #include "platform/Error.h"
+#include "platform/ListControls.h"
 
 #include <cstdint>
 #include <limits>
@@ -44,7 +45,12 @@ void CardMembers::SetControl(Control& control, const nlohmann::json& value) {
     case ControlKind::TextBox:
         static_cast<TextBox&>(control).setText(HostArgs::Text(value, name));
         return;
+    case ControlKind::DirList:
+        static_cast<DirListBox&>(control).setPath(HostArgs::Text(value, name));
+        return;
     case ControlKind::ComboBox:
+    case ControlKind::ListBox:
+    case ControlKind::DriveList:
         static_cast<ComboBox&>(control).setListIndex(
             static_cast<int32_t>(HostArgs::Integer(value, name, -1, kInt32Max)));
         return;

@@ -1,6 +1,7 @@
 #include "app/cli/StateJson.h"
 
 #include "platform/Encoding.h"
+#include "platform/ListControls.h"
 
 #include <algorithm>
 #include <cmath>
@@ -45,8 +46,21 @@ json StateJson::Forms(const ModuleState& shared) {
     json forms = json::object();
     for (const auto& [name, form] : shared.Forms)
         if (form)
-            forms[name] = {{"visible", form->Visible()}, {"controls", Controls(form->controls())}};
+            forms[name] = {{"visible", form->Visible()},
+                           {"controls", Controls(form->controls())},
+                           {"selections", Selections(form->controls())}};
     return forms;
+}
+
+// Where the caret and the selection of each text box are.
+json StateJson::Selections(const std::vector<Control*>& list) {
+    json selections = json::object();
+    for (const Control* control : list)
+        if (control->kind() == ControlKind::TextBox) {
+            const auto& box = static_cast<const TextBox&>(*control);
+            selections[box.name()] = {{"start", box.SelStart()}, {"length", box.SelLength()}};
+        }
+    return selections;
 }
 
 json StateJson::Account(const AccountEntry& entry) {
@@ -62,6 +76,11 @@ json StateJson::ControlValue(const Control& control) {
         return Text(static_cast<const TextBox&>(control).Text());
     case ControlKind::ComboBox:
         return static_cast<const ComboBox&>(control).ListIndex();
+    case ControlKind::ListBox:
+    case ControlKind::DriveList:
+        return ListValue(static_cast<const ComboBox&>(control));
+    case ControlKind::DirList:
+        return Text(static_cast<const DirListBox&>(control).Path());
     case ControlKind::CheckBox:
         return static_cast<const CheckBox&>(control).Value();
     case ControlKind::Shape:
@@ -73,6 +92,18 @@ json StateJson::ControlValue(const Control& control) {
         return Text(control.Caption());
     }
     return nullptr;
+}
+
+// A list the user picks from on a side form: its entries too, since a
+// script cannot know them beforehand.
+json StateJson::ListValue(const ComboBox& list) {
+    json entries = json::array();
+    for (int32_t i = 0; i < list.ListCount(); ++i)
+        entries.push_back(Text(list.List(i)));
+    json value = {{"index", list.ListIndex()}, {"entries", std::move(entries)}};
+    if (list.kind() == ControlKind::ListBox)
+        value["enabled"] = static_cast<const ListBox&>(list).Enabled();
+    return value;
 }
 
 json StateJson::GridCells(const Grid& grid) {

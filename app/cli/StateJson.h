@@ -39,6 +39,8 @@ private:
     static nlohmann::json Controls(const std::vector<Control*>& list);
     static nlohmann::json Forms(const ModuleState& shared);
     static nlohmann::json GridCells(const Grid& grid);
+    static nlohmann::json Selections(const std::vector<Control*>& list);
+    static nlohmann::json ListValue(const ComboBox& list);
     static nlohmann::json Document(const CurrentDocument& doc);
     static nlohmann::json Header(const DocumentHeader& header);
     static nlohmann::json Lines(const CurrentDocument& doc);
