@@ -2,12 +2,19 @@
 
 #include "fixfiles/AccountsFile.h"
 #include "fixfiles/TextDecoding.h"
+#include "forms/AccDetailsForm.h"
+#include "forms/OpenDirForm.h"
 #include "platform/Error.h"
 
 namespace dovrel {
 
+// Shows the company chooser; afterwards, confirmed or cancelled, the company
+// path box takes CompDir and the position and search start over.
 void Card::CmdDir_Click() {
-    services_.forms.ShowModal(form("frmOpenDir"));
+    Form& chooser = form("frmOpenDir");
+    if (auto* openDir = dynamic_cast<OpenDirForm*>(&chooser))
+        openDir->prepare(*this);
+    services_.forms.ShowModal(chooser);
     txtCompPath.setText(shared_.CompDir);
     txtCompPath_Change();
 }
@@ -28,7 +35,12 @@ void Card::cmdAccount_Click() {
         IgnoringErrors([&] { ReadACT(compDir); });
         IgnoringErrors([&] { accounts.CurrentAccount = FindAccount(accounts, key); });
     }
-    IgnoringErrors([&] { services_.forms.ShowModal(form("frmAccDetails")); });
+    IgnoringErrors([&] {
+        Form& details = form("frmAccDetails");
+        if (auto* accDetails = dynamic_cast<AccDetailsForm*>(&details))
+            accDetails->prepare(*this);
+        services_.forms.ShowModal(details);
+    });
 }
 
 } // namespace dovrel

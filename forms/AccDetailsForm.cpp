@@ -1,9 +1,66 @@
 #include "forms/AccDetailsForm.h"
 
 #include "control/Card.h"
+#include "forms/FormDesigns.h"
+#include "platform/Encoding.h"
+#include "platform/Error.h"
 
 namespace dovrel {
 
-AccDetailsForm::AccDetailsForm(Card& card) : Form("frmAccDetails"), card_(card) {}
+AccDetailsForm::AccDetailsForm(Card& card)
+    : Form("frmAccDetails"),
+      cmdCopyText{Button(ArrayElementName("cmdCopyText", 0)),
+                  Button(ArrayElementName("cmdCopyText", 1)),
+                  Button(ArrayElementName("cmdCopyText", 2))},
+      card_(&card) {
+    for (Control* control : std::initializer_list<Control*>{
+             &Label1, &txtPhone, &cmdCopyText[0], &Label2, &txtDetails, &cmdCopyText[1], &Label3,
+             &txtDistrict, &cmdCopyText[2]}) {
+        addControl(*control);
+        for (const ControlDesign& design : AccDetailsDesign())
+            if (design.name == control->name())
+                control->setCaption(design.caption);
+    }
+}
+
+void AccDetailsForm::prepare(Card& card) {
+    card_ = &card;
+    Load();
+}
+
+void AccDetailsForm::Load() {
+    const AccountEntry& account = card_->shared().Accounts.CurrentAccount;
+    txtPhone.setText(account.Phone);
+    txtDetails.setText(account.Details);
+    txtDistrict.setText(account.District);
+}
+
+void AccDetailsForm::Click(const std::string& name) {
+    for (size_t i = 0; i < cmdCopyText.size(); ++i)
+        if (name == cmdCopyText[i].name()) {
+            if (!Visible())
+                throw Error("The account details window is not shown; " + name +
+                            " cannot be used");
+            return cmdCopyText_Click(static_cast<int16_t>(i));
+        }
+}
+
+void AccDetailsForm::cmdCopyText_Click(int16_t Index) {
+    TextBox* boxes[] = {&txtPhone, &txtDetails, &txtDistrict};
+    if (Index < 0 || Index > 2)
+        throw Error("cmdCopyText has no element " + std::to_string(Index));
+    const TextBox& box = *boxes[Index];
+    std::string text = box.SelText();
+    if (text.empty())
+        text = box.Text();
+    if (text.empty()) {
+        card_->services().messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("שגיאה"),
+                                        FromUtf8("לא נמצא טקסט להעתקה"));
+        return;
+    }
+    // A clipboard that another program holds must not keep the window open.
+    IgnoringErrors([&] { card_->services().clipboard.SetText(text); });
+    Hide();
+}
 
 } // namespace dovrel

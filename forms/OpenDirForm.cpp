@@ -1,9 +1,154 @@
 #include "forms/OpenDirForm.h"
 
 #include "control/Card.h"
+#include "forms/FormDesigns.h"
+#include "platform/Encoding.h"
+#include "platform/Error.h"
 
 namespace dovrel {
 
-OpenDirForm::OpenDirForm(Card& card) : Form("frmOpenDir"), card_(card) {}
+namespace {
+
+constexpr const char* kScanHint = "לחץ על חפש חברות חשבשבת לאיתור החברות";
+constexpr const char* kScanning = "סורק ומאתר חברות. נא להמתין..";
+constexpr const char* kScanDone = "הסריקה הסתיימה. תקתוק כפול לבחירה...";
+
+} // namespace
+
+OpenDirForm::OpenDirForm(Card& card) : OpenDirForm(card, SystemMountPoints()) {}
+
+OpenDirForm::OpenDirForm(Card& card, std::vector<std::string> drives)
+    : Form("frmOpenDir"), PathDrive("PathDrive", std::move(drives)), card_(&card) {
+    for (Control* control : std::initializer_list<Control*>{
+             &Label1, &PathDrive, &MainDir, &cmdFindWizComp, &cmbCompany, &Msg1, &CancelButton,
+             &OKButton}) {
+        addControl(*control);
+        for (const ControlDesign& design : OpenDirDesign())
+            if (design.name == control->name())
+                control->setCaption(design.caption);
+    }
+    if (PathDrive.ListCount() > 0)
+        IgnoringErrors([&] { MainDir.setPath(PathDrive.Drive()); });
+    PathDrive.changed.connect([this] { PathDrive_Change(); });
+    MainDir.changed.connect([this] { MainDir_Change(); });
+}
+
+void OpenDirForm::prepare(Card& card) {
+    card_ = &card;
+    if (!unloaded_)
+        return;
+    reset();
+    Load();
+    unloaded_ = false;
+}
+
+// Back to the state of a form just made: the first drive and its root, an
+// empty list and status line.
+void OpenDirForm::reset() {
+    cmbCompany.Clear();
+    cmbCompany.setEnabled(true);
+    listed_.clear();
+    if (PathDrive.ListCount() > 0) {
+        IgnoringErrors([&] { PathDrive.setListIndex(0); });
+        IgnoringErrors([&] { MainDir.setPath(PathDrive.Drive()); });
+    }
+    cmbCompany.Clear();
+    Msg1.setCaption({});
+}
+
+void OpenDirForm::Load() {
+    IgnoringErrors([&] { PathDrive.setDrive(lastDrive_.empty() ? "c:" : lastDrive_); });
+    if (!lastMainDir_.empty())
+        IgnoringErrors([&] { MainDir.setPath(lastMainDir_); });
+}
+
+void OpenDirForm::requireShown(const std::string& control) const {
+    if (!Visible())
+        throw Error("The company chooser is not shown; " + control + " cannot be used");
+}
+
+void OpenDirForm::Click(const std::string& name) {
+    requireShown(name);
+    if (name == "cmdFindWizComp")
+        cmdFindWizComp_Click();
+    else if (name == "OKButton")
+        OKButton_Click();
+    else if (name == "CancelButton")
+        CancelButton_Click();
+}
+
+void OpenDirForm::DblClick(const std::string& name) {
+    requireShown(name);
+    if (name == "cmbCompany")
+        OKButton_Click();
+}
+
+void OpenDirForm::QueryClose() {
+    Hide();
+    unloaded_ = true;
+}
+
+void OpenDirForm::PathDrive_Change() {
+    std::string drive = PathDrive.Drive();
+    if (!drive.empty())
+        MainDir.setPath(drive);
+    cmbCompany.Clear();
+    listed_.clear();
+}
+
+void OpenDirForm::MainDir_Change() {
+    cmbCompany.Clear();
+    listed_.clear();
+    Msg1.setCaption(FromUtf8(kScanHint));
+}
+
+void OpenDirForm::cmdFindWizComp_Click() {
+    Msg1.setCaption(FromUtf8(kScanning));
+    if (!MainDir.Path().empty()) {
+        cmbCompany.setEnabled(false);
+        FindWizPaths(MainDir.Path());
+        cmbCompany.setEnabled(true);
+    }
+    Msg1.setCaption(FromUtf8(kScanDone));
+}
+
+void OpenDirForm::FindWizPaths(const std::string& root) {
+    companies_.clear();
+    cmbCompany.Clear();
+    listed_.clear();
+    try {
+        companies_ = FindCompanies(root);
+    } catch (const std::exception& e) {
+        showError("תקלה", FromUtf8(e.what()));
+        return;
+    }
+    for (size_t i = 0; i < companies_.size(); ++i) {
+        std::string name = ListedName(companies_[i]);
+        if (name.empty())
+            continue;
+        cmbCompany.AddItem(name);
+        listed_.push_back(i);
+    }
+}
+
+void OpenDirForm::OKButton_Click() {
+    int32_t index = cmbCompany.ListIndex();
+    if (index < 0 || static_cast<size_t>(index) >= listed_.size()) {
+        showError("שגיאה", FromUtf8("לא בחרת חברה"));
+        return;
+    }
+    card_->shared().CompDir = companies_[listed_[static_cast<size_t>(index)]].path;
+    lastDrive_ = PathDrive.Drive();
+    lastMainDir_ = MainDir.Path();
+    Hide();
+}
+
+void OpenDirForm::CancelButton_Click() {
+    Hide();
+}
+
+void OpenDirForm::showError(const char* titleUtf8, const std::string& text) {
+    card_->services().messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8(titleUtf8), text);
+}
 
 } // namespace dovrel
