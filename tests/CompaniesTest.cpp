@@ -1,0 +1,190 @@
+// The company scan: the stored-name conversion, the chooser's sort, the scan
+// of a main directory, and the drive list and directory tree it works with.
+#include "forms/Companies.h"
+
+#include "TestCompany.h"
+#include "platform/Error.h"
+#include "platform/ListControls.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <filesystem>
+#include <fstream>
+#include <random>
+
+namespace dovrel {
+namespace {
+
+using nlohmann::json;
+using test::TempDir;
+using test::U;
+using test::W;
+
+void WriteNamed(const std::filesystem::path& dir, const json& name) {
+    sample::WriteCompany(json{{"company", {{"name", name}}}}, dir);
+}
+
+std::vector<std::string> Paths(const std::vector<CompanyEntry>& table) {
+    std::vector<std::string> paths;
+    for (const CompanyEntry& entry : table)
+        paths.push_back(entry.path);
+    return paths;
+}
+
+TEST(CompaniesTest, StoredNamesComeOutInLogicalOrder) {
+    EXPECT_EQ(U(WAsc2Heb("\x80\x81\x82")), "גבא");
+    EXPECT_EQ(U(WAsc2Heb("12 \x82\x81\x80")), "אבג 12");
+    EXPECT_EQ(WAsc2Heb("AB C"), " ABC");
+    EXPECT_EQ(WAsc2Heb(""), "");
+    // Bytes above the letters are neutral and go to the front like a space.
+    EXPECT_EQ(WAsc2Heb(std::string("a\x9B\xFF\x9A", 4)), "\xFA\xFF\x9B"
+                                                         "a");
+    for (const char* name : {"דמו בע\"מ", "חברה 12", "אלפא-בטא"})
+        EXPECT_EQ(U(WAsc2Heb(sample::DosVisual(name))), name) << name;
+}
+
+TEST(CompaniesTest, TheSortOrdersByCodePointAndLeavesEqualNamesWhereItPutsThem) {
+    auto entry = [](const std::string& name, const std::string& path) {
+        std::string field = name;
+        field.resize(kCompanyNameField, ' ');
+        return CompanyEntry{path, field};
+    };
+    // The middle entry is the pivot; its equal neighbour is swapped past it.
+    std::vector<CompanyEntry> table = {entry("B", "p0"), entry("A", "p1"), entry("A", "p2")};
+    SortCompanies(table, 0, 2);
+    EXPECT_EQ(Paths(table), (std::vector<std::string>{"p2", "p1", "p0"}));
+
+    // Code points, not bytes: the euro sign (byte 0x80) comes after alef (0xE0);
+    // a blank name comes first.
+    table = {entry("\x80", "euro"), entry("\xE0", "alef"), entry("", "blank"), entry("z", "z")};
+    SortCompanies(table, 0, 3);
+    EXPECT_EQ(Paths(table), (std::vector<std::string>{"blank", "z", "alef", "euro"}));
+
+    // Any table comes out ordered, every entry kept; a part sorts only itself.
+    std::mt19937 random(7);
+    std::vector<CompanyEntry> big;
+    for (int i = 0; i < 500; ++i)
+        big.push_back(entry(std::string(1, static_cast<char>('a' + random() % 5)) +
+                                std::string(1, static_cast<char>(0xE0 + random() % 3)),
+                            std::to_string(i)));
+    std::vector<CompanyEntry> sorted = big;
+    SortCompanies(sorted, 0, 499);
+    EXPECT_TRUE(std::is_sorted(sorted.begin(), sorted.end(),
+                               [](const auto& a, const auto& b) { return a.name < b.name; }));
+    std::vector<std::string> before = Paths(big), after = Paths(sorted);
+    std::sort(before.begin(), before.end());
+    std::sort(after.begin(), after.end());
+    EXPECT_EQ(before, after);
+    std::vector<CompanyEntry> part = big;
+    SortCompanies(part, 100, 199);
+    EXPECT_TRUE(std::equal(part.begin(), part.begin() + 100, big.begin(),
+                           [](const auto& a, const auto& b) { return a.path == b.path; }));
+    EXPECT_THROW(SortCompanies(part, 0, 500), Error);
+}
+
+TEST(CompaniesTest, ScanFindsTheCompanyDirectoriesJustBelowTheMainDirectory) {
+    TempDir main;
+    const auto& root = main.path();
+    WriteNamed(root / "comp02", "אלפא");
+    WriteNamed(root / "comp01", "בטא");
+    WriteNamed(root / "deep" / "inner", "עמוק");
+    WriteNamed(root / ".hidden", "נסתר");
+    std::filesystem::create_directories(root / "empty");
+    std::filesystem::create_directories(root / "upper");
+    std::filesystem::copy_file(root / "comp01" / "adf.fix", root / "upper" / "ADF.FIX");
+    std::filesystem::create_directories(root / "short");
+    std::ofstream(root / "short" / "Adf.Fix", std::ios::binary) << "AB";
+    std::ofstream(root / "ADF.FIX") << "not a company directory";
+
+    std::string base = FromUtf8(root.string());
+    std::vector<CompanyEntry> table = FindCompanies(base);
+    ASSERT_EQ(table.size(), 4u);
+    // Whole paths, however long, and names filled to 20 bytes.
+    EXPECT_GT(base.size(), 30u);
+    // comp01 and upper share a name; the sort leaves them in this order.
+    EXPECT_EQ(Paths(table), (std::vector<std::string>{base + "/short", base + "/comp02",
+                                                      base + "/upper", base + "/comp01"}));
+    EXPECT_EQ(table[0].name, "AB" + std::string(18, ' '));
+    EXPECT_EQ(U(ListedName(table[1])), "אלפא");
+    EXPECT_EQ(U(ListedName(table[3])), "בטא");
+    for (const CompanyEntry& entry : table)
+        EXPECT_TRUE(std::filesystem::is_directory(ToUtf8(entry.path))) << entry.path;
+
+    // A separator at the end is not doubled; a missing directory is an error.
+    EXPECT_EQ(Paths(FindCompanies(base + "/")), Paths(table));
+    EXPECT_EQ(FindCompanies(base + "/empty").size(), 0u);
+    try {
+        FindCompanies(base + "/missing");
+        FAIL() << "a missing main directory was scanned";
+    } catch (const Error& e) {
+        EXPECT_NE(std::string(e.what()).find("missing"), std::string::npos) << e.what();
+    }
+}
+
+TEST(CompaniesTest, BlankNamesAreKeptInTheTableButNotListed) {
+    TempDir main;
+    WriteNamed(main.path() / "a", "");
+    WriteNamed(main.path() / "b", "ב");
+    std::vector<CompanyEntry> table = FindCompanies(FromUtf8(main.str()));
+    ASSERT_EQ(table.size(), 2u);
+    EXPECT_EQ(table[0].name, std::string(20, ' '));
+    EXPECT_EQ(ListedName(table[0]), "");
+    EXPECT_EQ(U(ListedName(table[1])), "ב");
+}
+
+TEST(CompaniesTest, DrivesAreTheMountPointsWithTheRootFirst) {
+    std::string table = "sysfs /sys sysfs rw 0 0\n"
+                        "/dev/sdb1 /mnt/data ext4 rw 0 0\n"
+                        "/dev/sda1 / ext4 rw 0 0\n"
+                        "proc /proc proc rw 0 0\n"
+                        "/dev/sdc1 /media/my\\040disk vfat rw 0 0\n"
+                        "/dev/sdb1 /mnt/data ext4 rw 0 0\n"
+                        "garbage\n"
+                        "/dev/sdd1 /mnt/\xd7\x90 ext4 rw 0 0\n";
+    EXPECT_EQ(MountPoints(table),
+              (std::vector<std::string>{"/", "/media/my disk", "/mnt/data", W("/mnt/א")}));
+    EXPECT_EQ(MountPoints(""), std::vector<std::string>{"/"});
+    EXPECT_EQ(SystemMountPoints().front(), "/");
+
+    DriveListBox drives("PathDrive", {"/", "/mnt/data"});
+    EXPECT_EQ(drives.Drive(), "/");
+    drives.setDrive("/mnt/data");
+    EXPECT_EQ(drives.ListIndex(), 1);
+    EXPECT_THROW(drives.setDrive("c:"), Error);
+    EXPECT_EQ(drives.Drive(), "/mnt/data");
+}
+
+TEST(CompaniesTest, TheDirectoryTreeShowsOnlyDirectoriesThatExist) {
+    TempDir dir;
+    std::ofstream(dir.path() / "file") << "x";
+    DirListBox tree("MainDir");
+    int changes = 0;
+    tree.changed.connect([&] { ++changes; });
+    tree.setPath(FromUtf8(dir.str()));
+    tree.setPath(FromUtf8(dir.str()));
+    EXPECT_EQ(changes, 1);
+    for (std::string bad : {std::string(), dir.str() + "/missing", dir.str() + "/file"})
+        EXPECT_THROW(tree.setPath(FromUtf8(bad)), Error) << bad;
+    EXPECT_EQ(tree.Path(), FromUtf8(dir.str()));
+}
+
+TEST(CompaniesTest, ATextBoxSelectionStaysInsideItsText) {
+    TextBox box("txtPhone", "03-1234567");
+    box.setSelStart(3);
+    box.setSelLength(100);
+    EXPECT_EQ(box.SelText(), "1234567");
+    box.setSelStart(50);
+    EXPECT_EQ(box.SelStart(), 10);
+    EXPECT_EQ(box.SelLength(), 0);
+    EXPECT_THROW(box.setSelStart(-1), Error);
+    EXPECT_THROW(box.setSelLength(-1), Error);
+    box.setSelStart(0);
+    box.setSelLength(2);
+    box.setText("new");
+    EXPECT_EQ(box.SelLength(), 0);
+    EXPECT_EQ(box.SelText(), "");
+}
+
+} // namespace
+} // namespace dovrel
