@@ -1,0 +1,204 @@
+// The company chooser as the user works it: drive and directory, scan, pick,
+// cancel, close, and what the control does with the choice.
+#include "forms/OpenDirForm.h"
+
+#include "TestCompany.h"
+#include "control/Card.h"
+#include "platform/Error.h"
+#include "platform/SettingsStore.h"
+
+#include <gtest/gtest.h>
+
+#include <filesystem>
+#include <functional>
+
+namespace dovrel {
+namespace {
+
+using nlohmann::json;
+using test::TempDir;
+using test::U;
+using test::W;
+
+// Shows a form to a script: what the user does while it is open.
+class ScriptedForms : public FormPresenter {
+public:
+    void ShowModal(Form& form) override {
+        form.Show();
+        if (user)
+            user(dynamic_cast<OpenDirForm&>(form));
+        if (form.Visible())
+            form.QueryClose();
+    }
+    std::function<void(OpenDirForm&)> user;
+};
+
+json Company(const std::string& name, const std::string& reference) {
+    json line = {{"key", "A1"}, {"price", 1}, {"quantity", 1}};
+    return {{"company", {{"name", name}}},
+            {"documents",
+             {{{"type", 20}, {"reference", reference}, {"date", "2024-01-10"}, {"lines", {line}}}}}};
+}
+
+class OpenDirFormTest : public ::testing::Test {
+protected:
+    OpenDirFormTest() {
+        sample::WriteCompany(Company("גמל", "300"), main.path() / "comp01");
+        sample::WriteCompany(Company("אלף", "100"), main.path() / "comp02");
+        sample::WriteCompany(Company("", "900"), main.path() / "blank");
+        sample::WriteCompany(Company("בית", "200"), main.path() / "comp03");
+        card = std::make_unique<Card>(services, state);
+        card->UserControl_InitProperties(nullptr);
+    }
+    std::string dir(const std::string& name) const {
+        return FromUtf8((main.path() / name).string());
+    }
+    // Opens the chooser, goes to the main directory and scans it.
+    void scanThen(const std::function<void(OpenDirForm&)>& then) {
+        forms.user = [&](OpenDirForm& form) {
+            form.MainDir.setPath(FromUtf8(main.str()));
+            form.Click("cmdFindWizComp");
+            then(form);
+        };
+        card->Click("CmdDir");
+    }
+    OpenDirForm& chooser() { return dynamic_cast<OpenDirForm&>(*state.Forms.at("frmOpenDir")); }
+    std::vector<std::string> listed() {
+        std::vector<std::string> names;
+        for (int32_t i = 0; i < chooser().cmbCompany.ListCount(); ++i)
+            names.push_back(U(chooser().cmbCompany.List(i)));
+        return names;
+    }
+
+    TempDir main;
+    RecordedMessages messages;
+    MemorySettingsStore settings;
+    ScriptedForms forms;
+    MemoryClipboard clipboard;
+    RecordingBrowser browser;
+    FixedClock clock{{2026, 12, 6}};
+    CardServices services{messages, settings, forms, clipboard, browser, clock};
+    ModuleState state;
+    std::unique_ptr<Card> card;
+};
+
+TEST_F(OpenDirFormTest, ChoosingACompanySetsThePathAndFirstReadsFromIt) {
+    scanThen([&](OpenDirForm& form) {
+        EXPECT_TRUE(form.cmbCompany.Enabled());
+        EXPECT_EQ(U(form.Msg1.Caption()), "הסריקה הסתיימה. תקתוק כפול לבחירה...");
+        form.cmbCompany.setListIndex(1);
+        form.Click("OKButton");
+        EXPECT_FALSE(form.Visible());
+    });
+    // Blank names are left out; the entry after one still gives its own directory.
+    EXPECT_EQ(listed(), (std::vector<std::string>{"אלף", "בית", "גמל"}));
+    EXPECT_EQ(state.CompDir, dir("comp03"));
+    EXPECT_EQ(card->txtCompPath.Text(), dir("comp03"));
+    EXPECT_EQ(chooser().companies().size(), 4u);
+    EXPECT_EQ(chooser().LastMainDir(), FromUtf8(main.str()));
+    EXPECT_EQ(chooser().LastDrive(), "/");
+    card->cmbDocType.setListIndex(13); // delivery notes
+    card->Click("FirstButt");
+    EXPECT_EQ(card->txtReference1.Text(), "200");
+    EXPECT_TRUE(messages.shown().empty());
+
+    // Double-clicking an entry confirms it as OK does.
+    forms.user = [](OpenDirForm& form) {
+        form.cmbCompany.setListIndex(2);
+        form.DblClick("cmbCompany");
+    };
+    card->Click("CmdDir");
+    EXPECT_EQ(state.CompDir, dir("comp01"));
+}
+
+TEST_F(OpenDirFormTest, CancelKeepsThePathAndTheListButResetsThePosition) {
+    card->SetCompDir(Variant(dir("comp02")));
+    card->Click("FirstButt");
+    card->DblClick("Label2");
+    card->PubACTLocation = 9;
+    scanThen([](OpenDirForm& form) {
+        form.cmbCompany.setListIndex(0);
+        form.Click("CancelButton");
+    });
+    EXPECT_EQ(state.CompDir, dir("comp02"));
+    EXPECT_EQ(card->PubACTLocation, 2);
+    EXPECT_EQ(card->PubSearchBy, "");
+    // Shown again, the form is as the user left it.
+    forms.user = [](OpenDirForm& form) {
+        EXPECT_EQ(form.cmbCompany.ListCount(), 3);
+        EXPECT_EQ(form.cmbCompany.ListIndex(), 0);
+        form.Click("CancelButton");
+    };
+    card->Click("CmdDir");
+}
+
+TEST_F(OpenDirFormTest, OkWithoutAChoiceSaysSoAndStays) {
+    scanThen([&](OpenDirForm& form) {
+        form.Click("OKButton");
+        EXPECT_TRUE(form.Visible());
+        ASSERT_EQ(messages.shown().size(), 1u);
+        EXPECT_EQ(U(messages.shown()[0].title), "שגיאה");
+        EXPECT_EQ(U(messages.shown()[0].text), "לא בחרת חברה");
+        EXPECT_EQ(messages.shown()[0].icon, MsgIcon::Critical);
+        form.Click("CancelButton");
+    });
+    EXPECT_EQ(state.CompDir, card->txtCompPath.Text());
+}
+
+TEST_F(OpenDirFormTest, AFailedScanIsReportedAndLeavesTheListEmpty) {
+    std::filesystem::create_directories(main.path() / "gone");
+    forms.user = [&](OpenDirForm& form) {
+        form.MainDir.setPath(dir("gone"));
+        EXPECT_EQ(U(form.Msg1.Caption()), "לחץ על חפש חברות חשבשבת לאיתור החברות");
+        std::filesystem::remove(main.path() / "gone");
+        form.Click("cmdFindWizComp");
+        EXPECT_EQ(form.cmbCompany.ListCount(), 0);
+        EXPECT_TRUE(form.cmbCompany.Enabled());
+        EXPECT_EQ(U(form.Msg1.Caption()), "הסריקה הסתיימה. תקתוק כפול לבחירה...");
+    };
+    card->Click("CmdDir");
+    ASSERT_EQ(messages.shown().size(), 1u);
+    EXPECT_EQ(U(messages.shown()[0].title), "תקלה");
+    EXPECT_NE(messages.shown()[0].text.find("gone"), std::string::npos);
+}
+
+TEST_F(OpenDirFormTest, ClosingTheWindowStartsAfreshFromTheLastChoice) {
+    scanThen([](OpenDirForm& form) {
+        form.cmbCompany.setListIndex(0);
+        form.Click("OKButton");
+    });
+    // The window's close button: the form is unloaded.
+    scanThen([](OpenDirForm& form) { form.MainDir.setPath("/"); });
+    forms.user = [&](OpenDirForm& form) {
+        EXPECT_EQ(form.cmbCompany.ListCount(), 0);
+        EXPECT_EQ(form.PathDrive.Drive(), "/");
+        EXPECT_EQ(form.MainDir.Path(), FromUtf8(main.str()));
+    };
+    card->Click("CmdDir");
+    EXPECT_EQ(state.CompDir, dir("comp02"));
+    // The buttons of a hidden form cannot be pressed.
+    EXPECT_THROW(chooser().Click("OKButton"), Error);
+}
+
+TEST(OpenDirFormLoadTest, ADriveThatIsNotThereLeavesTheFirstAndADriveChangeMovesTheTree) {
+    RecordedMessages messages;
+    ModuleState state;
+    Card card(messages, state);
+    TempDir other;
+    OpenDirForm form(card, {"/", FromUtf8(other.str())});
+    form.Load(); // the remembered drive is empty: "c:", which is not there
+    EXPECT_EQ(form.PathDrive.Drive(), "/");
+    EXPECT_EQ(form.MainDir.Path(), "/");
+    EXPECT_EQ(form.Msg1.Caption(), "");
+    form.cmbCompany.AddItem("x");
+    form.PathDrive.setListIndex(1);
+    EXPECT_EQ(form.MainDir.Path(), FromUtf8(other.str()));
+    EXPECT_EQ(form.cmbCompany.ListCount(), 0);
+    EXPECT_EQ(U(form.Msg1.Caption()), "לחץ על חפש חברות חשבשבת לאיתור החברות");
+    ASSERT_NE(form.findControl("cmdFindWizComp"), nullptr);
+    EXPECT_EQ(U(form.findControl("cmdFindWizComp")->Caption()), "לחץ כאן לחיפוש חברות חשבשבת...");
+    EXPECT_EQ(form.controls().size(), 8u);
+}
+
+} // namespace
+} // namespace dovrel
