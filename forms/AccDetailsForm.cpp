@@ -28,11 +28,16 @@ void AccDetailsForm::prepare(Card& card) {
     Load();
 }
 
+// A window loaded afresh: the account's texts, nothing selected.
 void AccDetailsForm::Load() {
     const AccountEntry& account = card_->shared().Accounts.CurrentAccount;
     txtPhone.setText(account.Phone);
     txtDetails.setText(account.Details);
     txtDistrict.setText(account.District);
+    for (TextBox* box : {&txtPhone, &txtDetails, &txtDistrict}) {
+        box->setSelLength(0);
+        box->setSelStart(0);
+    }
 }
 
 void AccDetailsForm::Click(const std::string& name) {
