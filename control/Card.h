@@ -90,6 +90,12 @@ public:
     void WriteCell(int16_t& MyNum, std::string& CellValue);
     std::string RulesValue();
 
+    // What the print button writes: the company record and, when the page
+    // needs them, the items are read, then the page the language list asks
+    // for is written at path. False, and nothing written, when no language
+    // is chosen.
+    bool WritePage(const std::string& path);
+
     // Moves one property of a control (kind 1 Text, 2 ListIndex, 3 Value) to
     // the settings store (Action 1) or from it (Action 2).
     void SetGetRegParam(uint8_t Action, const std::string& AppName, const std::string& Section,

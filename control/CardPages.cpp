@@ -102,25 +102,30 @@ std::string Card::RulesValue() {
     return RulesFor(cmbRules.ListIndex());
 }
 
-// Writes the page the language list asks for into this user's print file
-// and opens it in the browser. With no language chosen nothing is written
-// and nothing opened. A failure is shown as a message and opens nothing.
+bool Card::WritePage(const std::string& path) {
+    std::string compDir = shared_.CompDir;
+    ReadAdf(compDir, shared_.Company);
+    if (ChkWithDrawing.Value() == 1 || ChkUseFName.Value() == 1)
+        ReadITM(compDir);
+    std::string file = path;
+    int16_t format = kPricedPage;
+    bool useForeignNames = ChkUseFName.Value() == 1;
+    switch (CmbDocLang.ListIndex()) {
+    case 0: CreateHTML(file, format); return true;
+    case 1: CreateHTMLEng(file, useForeignNames); return true;
+    case 2: format = kPageWithoutAmounts; CreateHTML(file, format); return true;
+    default: return false;
+    }
+}
+
+// Writes the page into this user's print file and opens it in the browser.
+// With no language chosen nothing is written and nothing opened. A failure
+// is shown as a message and opens nothing.
 void Card::PrintButt_Click() {
     try {
-        std::string compDir = shared_.CompDir;
-        ReadAdf(compDir, shared_.Company);
-        if (ChkWithDrawing.Value() == 1 || ChkUseFName.Value() == 1)
-            ReadITM(compDir);
-        std::string path;
-        int16_t format = kPricedPage;
-        bool useForeignNames = ChkUseFName.Value() == 1;
-        switch (CmbDocLang.ListIndex()) {
-        case 0: path = PrintFilePath(); CreateHTML(path, format); break;
-        case 1: path = PrintFilePath(); CreateHTMLEng(path, useForeignNames); break;
-        case 2: path = PrintFilePath(); format = kPageWithoutAmounts; CreateHTML(path, format); break;
-        default: return;
-        }
-        services_.browser.Open(path);
+        std::string path = PrintFilePath();
+        if (WritePage(path))
+            services_.browser.Open(path);
     } catch (const std::exception& e) {
         services_.messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("תקלה"), e.what());
     }
