@@ -1,0 +1,40 @@
+#include "app/cli/AccountCommand.h"
+
+#include "app/cli/StateJson.h"
+#include "fixfiles/AccountsFile.h"
+#include "fixfiles/TextDecoding.h"
+#include "platform/Encoding.h"
+#include "platform/Error.h"
+
+#include <ostream>
+
+#include <nlohmann/json.hpp>
+
+namespace dovrel {
+
+int AccountCommand::run(std::ostream& out) {
+    std::string key = TrimCopy(FromUtf8(options_.key));
+    if (key.empty())
+        throw Error("Give the key of the account");
+    // The scan's progress bar, which nobody sees here.
+    Shape frame("ProgressFrame", 0, 0, 1000, 100);
+    Shape fill("ProgressFill", 0, 0, 0, 100);
+    AccountsTable table;
+    ReadACT(FromUtf8(options_.compDir), table, {frame, fill});
+    AccountEntry account = FindAccount(table, key);
+    if (options_.json) {
+        nlohmann::json answer = {{"key", ToUtf8(key)},
+                                 {"found", !account.Key.empty()},
+                                 {"phone", ToUtf8(account.Phone)},
+                                 {"details", ToUtf8(account.Details)},
+                                 {"district", ToUtf8(account.District)}};
+        out << StateJson::Dump(answer, 2) << '\n';
+        return 0;
+    }
+    out << "טלפונים: " << ToUtf8(account.Phone) << '\n'
+        << "פרטים: " << ToUtf8(account.Details) << '\n'
+        << "שכונה: " << ToUtf8(account.District) << '\n';
+    return 0;
+}
+
+} // namespace dovrel

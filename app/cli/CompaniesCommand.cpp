@@ -1,0 +1,40 @@
+#include "app/cli/CompaniesCommand.h"
+
+#include "app/cli/StateJson.h"
+#include "forms/Companies.h"
+#include "platform/Encoding.h"
+#include "platform/Error.h"
+
+#include <ostream>
+
+#include <nlohmann/json.hpp>
+
+namespace dovrel {
+
+int CompaniesCommand::run(std::ostream& out, std::ostream& err) {
+    if (options_.mainDir.empty())
+        throw Error("Give the main directory to scan");
+    std::string root = FromUtf8(options_.mainDir);
+    if (ToUtf8(root) != options_.mainDir)
+        throw Error("The main directory cannot be named in the Hebrew code page: " +
+                    options_.mainDir);
+    nlohmann::json list = nlohmann::json::array();
+    size_t listed = 0;
+    for (const CompanyEntry& entry : FindCompanies(root)) {
+        std::string name = ListedName(entry);
+        if (name.empty())
+            continue;
+        ++listed;
+        if (options_.json)
+            list.push_back({{"name", ToUtf8(name)}, {"path", ToUtf8(entry.path)}});
+        else
+            out << ToUtf8(name) << '\t' << ToUtf8(entry.path) << '\n';
+    }
+    if (options_.json)
+        out << StateJson::Dump(list, 2) << '\n';
+    else if (listed == 0)
+        err << "No companies found in " << options_.mainDir << '\n';
+    return 0;
+}
+
+} // namespace dovrel
