@@ -1,13 +1,22 @@
+// The control's picture work: the lookup that gives each line of the current
+// document its picture, and the picture settings form.
 #include "control/Card.h"
+
+#include "pictures/PictureLookup.h"
 
 namespace dovrel {
 
-// Fills the picture file name of each line of the current document from the
-// picture database; nothing yet.
-void Card::FillPicPath(std::string&) {}
+void Card::FillPicPath(std::string& pDbName) {
+    FillPictures(pDbName, shared_.Doc);
+}
 
+// Closing the form drops what was typed but not saved: it is loaded again
+// from the settings store and the picture database, as on its next use.
 void Card::CmdParams_Click() {
-    services_.forms.ShowModal(form("frmItemPics"));
+    Form& settings = form("frmItemPics");
+    services_.forms.ShowModal(settings);
+    if (!settings.Visible())
+        settings.Load();
 }
 
 } // namespace dovrel

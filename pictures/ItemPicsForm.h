@@ -2,10 +2,17 @@
 
 #include "platform/Controls.h"
 #include "platform/Form.h"
+#include "platform/Grid.h"
+
+#include <cstdint>
+#include <memory>
+#include <string>
+#include <vector>
 
 namespace dovrel {
 
 class Card;
+class Messages;
 
 // The picture settings form: the printed page's settings and the ranges of
 // item keys and category codes with their pictures.
@@ -13,15 +20,59 @@ class ItemPicsForm : public Form {
 public:
     explicit ItemPicsForm(Card& card);
 
+    // Resets the grid, loads the six settings, mirrors them into the module
+    // state and fills the grid from the picture database.
+    void Load() override;
+    // The form's buttons; labels and frames do nothing; an unknown name is an error.
+    void Click(const std::string& name) override;
+
+    void InitItemPicLines();
+    // Adds the ranges of the database to the grid; the number of rows added.
+    int16_t FillGridLines(const std::string& pDbName);
+    // 1 saves the six settings, 2 loads them; anything else does nothing.
+    void SetGetMoreParams(uint8_t Action);
+    // True when the database file exists at the DBPath setting; otherwise says so.
+    bool CheckDBFile();
+
+    void CmdDelete_Click();
+    void CmdNew_Click();
+    void CmdUpdate_Click();
+    void cmdSaveDef_Click();
+    void CmdInitDB_Click();
+    void cmdClose_Click();
+
+    // The RangeID a grid row was loaded or saved with; 0 for the heading, a
+    // row added since and a row beyond the grid.
+    int32_t RowRangeID(int32_t row) const;
+
     TextBox txtLogoFile{"txtLogoFile"};
     TextBox txtCompTitle{"txtCompTitle"};
     TextBox txtDBPath{"txtDBPath"};
     TextBox txtPicPath{"txtPicPath"};
     TextBox txtPicX{"txtPicX"};
     TextBox txtPicY{"txtPicY"};
+    Grid ItemPicLines{"ItemPicLines"};
+    Button CmdInitDB{"CmdInitDB"};
+    Button CmdDelete{"CmdDelete"};
+    Button CmdNew{"CmdNew"};
+    Button CmdUpdate{"CmdUpdate"};
+    Button cmdSaveDef{"cmdSaveDef"};
+    Button cmdClose{"cmdClose"};
 
 private:
+    void buildControls();
+    void mirrorSettings();
+    // The database file at the DBPath setting.
+    std::string settingDbName() const;
+    Messages& messages() const;
+    // Shows a database failure under the title "תקלה".
+    void showFailure(const std::exception& failure) const;
+    bool confirm(const char* questionUtf8) const;
+    void reloadGrid();
+
     Card& card_;
+    std::vector<std::unique_ptr<Control>> plain_; // labels and frames
+    std::vector<int32_t> rangeIds_;               // by grid row, heading included
 };
 
 } // namespace dovrel

@@ -1,0 +1,295 @@
+// The picture settings form as the user drives it: its settings, its ranges
+// grid and buttons over the picture database, and the control's lookup.
+
+#include "pictures/ItemPicsForm.h"
+#include "TestCompany.h"
+#include "control/Card.h"
+#include "pictures/ItemPicsDesign.h"
+#include "pictures/PictureDb.h"
+#include "platform/Error.h"
+#include "platform/SettingsStore.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <fstream>
+#include <functional>
+#include <set>
+
+namespace dovrel {
+namespace {
+
+using ::testing::HasSubstr;
+using test::U;
+using test::W;
+using Text = std::optional<std::string>;
+
+// Shows the form and runs what the user does in it; then the window closes.
+class ScriptedForms : public FormPresenter {
+public:
+    void ShowModal(Form& form) override {
+        form.Show();
+        if (script)
+            script(form);
+        if (form.Visible())
+            form.QueryClose();
+    }
+    std::function<void(Form&)> script;
+};
+
+PictureRange R(Text fromKey, Text toKey, Text fromCode, Text toCode, Text pic) {
+    return {0, fromKey, toKey, fromCode, toCode, pic};
+}
+
+class ItemPicsFormTest : public ::testing::Test {
+protected:
+    // A control started with the picture database directory set to the test's.
+    ItemPicsForm& start() {
+        settings.SaveSetting("Dovrel", "Params", "DBPath", dbDir);
+        card = std::make_unique<Card>(services, state);
+        card->UserControl_InitProperties(nullptr);
+        return static_cast<ItemPicsForm&>(*state.Forms.at("frmItemPics"));
+    }
+    std::vector<std::vector<std::string>> rows(const ItemPicsForm& form) const {
+        std::vector<std::vector<std::string>> all;
+        for (int32_t row = 1; row < form.ItemPicLines.Rows(); ++row) {
+            all.emplace_back();
+            for (int32_t col = 0; col < 5; ++col)
+                all.back().push_back(U(form.ItemPicLines.TextMatrix(row, col)));
+        }
+        return all;
+    }
+    // The messages shown since the last look, as "title: text".
+    std::vector<std::string> shown() {
+        std::vector<std::string> texts;
+        for (const RecordedMessages::Shown& m : messages.take())
+            texts.push_back(U(m.title) + ": " + U(m.text));
+        return texts;
+    }
+
+    test::TempDir dir;
+    std::string dbDir = FromUtf8(dir.str() + "/");
+    PictureDb db{dbDir + "Dovrel.def"};
+    RecordedMessages messages;
+    MemorySettingsStore settings;
+    ScriptedForms forms;
+    MemoryClipboard clipboard;
+    RecordingBrowser browser;
+    FixedClock clock{{2026, 12, 6}};
+    CardServices services{messages, settings, forms, clipboard, browser, clock};
+    ModuleState state;
+    std::unique_ptr<Card> card;
+};
+
+TEST_F(ItemPicsFormTest, AFirstStartShowsTheDefaultsAndEveryControlOfTheDesign) {
+    card = std::make_unique<Card>(services, state);
+    card->UserControl_InitProperties(nullptr);
+    auto& form = static_cast<ItemPicsForm&>(*state.Forms.at("frmItemPics"));
+    EXPECT_FALSE(form.Visible());
+    EXPECT_EQ(std::vector<std::string>({U(form.txtLogoFile.Text()), U(form.txtCompTitle.Text()),
+                                        U(form.txtDBPath.Text()), U(form.txtPicPath.Text()),
+                                        U(form.txtPicX.Text()), U(form.txtPicY.Text())}),
+              std::vector<std::string>({"c:\\logo.jpg", "רחוב הגפן 9, חיפה. טלפון: 04-8123456",
+                                        "c:\\", "c:\\", "50", "50"}));
+    EXPECT_EQ(std::vector<std::string>({U(state.LogoFile), U(state.CompTitle), state.DBPath,
+                                        state.PicPath, state.PicX, state.PicY}),
+              std::vector<std::string>({"c:\\logo.jpg", "רחוב הגפן 9, חיפה. טלפון: 04-8123456",
+                                        "c:\\", "c:\\", "50", "50"}));
+    EXPECT_EQ(form.ItemPicLines.Rows(), 1);
+    EXPECT_EQ(U(form.ItemPicLines.FormatString()),
+              "<ממפתח פריט          |<עד מפתח פריט          |<מקוד מיון |<עד קוד מיון |"
+              "<קובץ תמונה" + std::string(40, ' '));
+    EXPECT_TRUE(messages.shown().empty());
+
+    std::set<std::string> names;
+    for (const ControlDesign& design : ItemPicsDesign()) {
+        EXPECT_TRUE(names.insert(design.name).second) << design.name;
+        Control* control = form.findControl(design.name);
+        ASSERT_NE(control, nullptr) << design.name;
+        EXPECT_EQ(control->kind(), design.kind) << design.name;
+        EXPECT_EQ(control->Caption(), design.caption) << design.name;
+        EXPECT_LE(design.left + design.width, kItemPicsDesignWidth) << design.name;
+        EXPECT_LE(design.top + design.height, kItemPicsDesignHeight) << design.name;
+        if (!design.labelFor.empty()) {
+            EXPECT_NE(FindItemPicsDesign(design.labelFor), nullptr) << design.name;
+        }
+    }
+    EXPECT_EQ(form.controls().size(), ItemPicsDesign().size());
+    EXPECT_EQ(U(form.findControl("CmdUpdate")->Caption()), "שמור שינויים");
+    form.Click("Label3"); // a label does nothing
+    EXPECT_THROW(form.Click("NoSuchControl"), Error);
+}
+
+TEST_F(ItemPicsFormTest, ButtonsThatNeedTheDatabaseSayWhenItIsMissing) {
+    ItemPicsForm& form = start();
+    for (const char* button : {"CmdNew", "CmdDelete", "CmdUpdate"}) {
+        form.Click(button);
+        EXPECT_EQ(shown(), std::vector<std::string>{"שגיאה: קובץ ההגדרות אינו נמצא"}) << button;
+    }
+    EXPECT_EQ(form.ItemPicLines.Rows(), 1);
+}
+
+TEST_F(ItemPicsFormTest, SavingWritesTheRowsAsRanges1ToNInOneTransaction) {
+    db.create(false);
+    db.replaceAll({R("1", "1", {}, "9", "a"), R("2", "2", {}, "9", "b"), R("3", "3", {}, "9", "c"),
+                   R("4", "4", "1", "9", "d"), R("5", "5", {}, "9", "e")});
+    ItemPicsForm& form = start();
+    ASSERT_EQ(rows(form).size(), 5u);
+    EXPECT_EQ(rows(form)[3], (std::vector<std::string>{"4", "4", "1", "9", "d"}));
+
+    form.ItemPicLines.setRows(4);
+    form.ItemPicLines.setTextMatrix(1, 0, "");
+    form.Click("CmdUpdate");
+    EXPECT_EQ(shown(), std::vector<std::string>{});
+    std::vector<PictureRange> stored = db.rangesById();
+    ASSERT_EQ(stored.size(), 3u);
+    EXPECT_EQ(stored[0], (PictureRange{1, {}, "1", {}, "9", "a"})); // "" is stored as Null
+    EXPECT_EQ(stored[2].PicFile, "c");
+
+    // A refused row: the message names it and nothing is stored.
+    form.Click("CmdNew");
+    EXPECT_EQ(rows(form)[3], (std::vector<std::string>{"", "תתתתתתתתתתתת", "", "999", "pic001.jpg"}));
+    form.ItemPicLines.setTextMatrix(1, 4, "changed.jpg");
+    form.ItemPicLines.setTextMatrix(2, 1, "");
+    form.Click("CmdUpdate");
+    std::vector<std::string> failure = shown();
+    ASSERT_EQ(failure.size(), 1u);
+    EXPECT_THAT(failure[0], HasSubstr("תקלה: Cannot save the picture ranges to"));
+    EXPECT_THAT(failure[0], HasSubstr("row 2: the highest item key (ToItemKey) is empty"));
+    EXPECT_EQ(db.rangesById(), stored);
+
+    form.ItemPicLines.setTextMatrix(2, 1, "2");
+    form.Click("CmdUpdate");
+    ASSERT_EQ(db.rangesById().size(), 4u);
+    EXPECT_EQ(db.rangesById()[3].ToItemKey, W("תתתתתתתתתתתת"));
+    EXPECT_EQ(form.RowRangeID(4), 4);
+
+    form.ItemPicLines.setRows(1);
+    form.Click("CmdUpdate");
+    EXPECT_TRUE(db.rangesById().empty());
+}
+
+TEST_F(ItemPicsFormTest, DeleteTakesTheRangeTheSelectedRowShowsEvenWithGaps) {
+    db.create(false);
+    db.replaceAll({R("1", "1", {}, "9", "a"), R("2", "2", {}, "9", "b"), R("3", "3", {}, "9", "c")});
+    db.remove(2); // another program left a gap
+    ItemPicsForm& form = start();
+    ASSERT_EQ(rows(form).size(), 2u);
+    EXPECT_EQ(form.RowRangeID(2), 3);
+
+    form.ItemPicLines.setRow(2);
+    form.Click("CmdDelete"); // answered No
+    EXPECT_EQ(shown(), std::vector<std::string>{"שימו לב: האם למחוק?"});
+    EXPECT_EQ(db.rangesById().size(), 2u);
+
+    messages.queueAnswer(MsgAnswer::Yes);
+    form.Click("CmdDelete");
+    ASSERT_EQ(db.rangesById().size(), 1u);
+    EXPECT_EQ(db.rangesById()[0].PicFile, "a");
+    EXPECT_EQ(rows(form), (std::vector<std::vector<std::string>>{{"1", "1", "", "9", "a"}}));
+
+    // A row added but not saved deletes nothing; the grid shows the database again.
+    form.Click("CmdNew");
+    form.ItemPicLines.setRow(2);
+    messages.queueAnswer(MsgAnswer::Yes);
+    form.Click("CmdDelete");
+    EXPECT_EQ(db.rangesById().size(), 1u);
+    EXPECT_EQ(rows(form).size(), 1u);
+}
+
+TEST_F(ItemPicsFormTest, ReCreatingAsksAndKeepsAForeignFileUnlessConfirmedTwice) {
+    db.create(false);
+    db.replaceAll({R("1", "1", {}, {}, "a")});
+    ItemPicsForm& form = start();
+    form.Click("CmdInitDB"); // answered No
+    EXPECT_EQ(shown(), std::vector<std::string>{"שימו לב: האם אתה בטוח?"});
+    EXPECT_EQ(db.rangesById().size(), 1u);
+
+    messages.queueAnswer(MsgAnswer::Yes);
+    form.Click("CmdInitDB");
+    EXPECT_EQ(shown(), (std::vector<std::string>{"שימו לב: האם אתה בטוח?",
+                                                 "הודעה: בסיס הנתונים אותחל"}));
+    EXPECT_TRUE(db.rangesById().empty());
+    EXPECT_EQ(rows(form).size(), 1u); // the grid keeps its rows for a save
+
+    const std::string foreign = std::string("\0\1\0\0Standard Jet DB\0", 20) + "data";
+    std::ofstream(dir.path() / "Dovrel.def", std::ios::binary | std::ios::trunc) << foreign;
+    messages.queueAnswer(MsgAnswer::Yes);
+    form.Click("CmdInitDB"); // the second question answered No
+    std::vector<std::string> asked = shown();
+    ASSERT_EQ(asked.size(), 2u);
+    EXPECT_THAT(asked[1], HasSubstr("אינו בסיס נתונים של תמונות (it is an Access (Jet) database"));
+    EXPECT_EQ(test::ReadAll(dir.path() / "Dovrel.def"), foreign);
+
+    messages.queueAnswer(MsgAnswer::Yes);
+    messages.queueAnswer(MsgAnswer::Yes);
+    form.Click("CmdInitDB");
+    EXPECT_EQ(shown().back(), "הודעה: בסיס הנתונים אותחל");
+    EXPECT_EQ(db.inspect().kind, PictureDb::FileKind::Pictures);
+
+    // The typed directory is taken, and a failure there says so.
+    form.txtDBPath.setText(dbDir + "missing/");
+    messages.queueAnswer(MsgAnswer::Yes);
+    form.Click("CmdInitDB");
+    EXPECT_EQ(state.DBPath, dbDir + "missing/");
+    EXPECT_THAT(shown().back(), HasSubstr("תקלה: Cannot create the picture database"));
+}
+
+TEST_F(ItemPicsFormTest, SettingsAreSavedByTheirButtonAndTypingIsDroppedOnClose) {
+    ItemPicsForm& form = start();
+    form.txtPicX.setText("80");
+    form.txtPicPath.setText("/pics/");
+    form.Click("cmdSaveDef");
+    EXPECT_EQ(settings.GetSetting("Dovrel", "Params", "PicX", ""), "80");
+    EXPECT_EQ(settings.GetSetting("Dovrel", "Params", "LogoFile", ""), "c:\\logo.jpg");
+    EXPECT_EQ(state.PicPath, "/pics/");
+
+    forms.script = [](Form& shown) {
+        auto& f = static_cast<ItemPicsForm&>(shown);
+        f.txtPicX.setText("99");
+        f.Click("cmdClose");
+    };
+    card->Click("CmdParams");
+    EXPECT_FALSE(form.Visible());
+    EXPECT_EQ(form.txtPicX.Text(), "80");
+    EXPECT_EQ(state.PicX, "80");
+}
+
+TEST_F(ItemPicsFormTest, ADamagedDatabaseAtLoadIsReportedAndLeavesTheGridEmpty) {
+    std::ofstream(dir.path() / "Dovrel.def", std::ios::binary) << std::string(5000, 'x');
+    ItemPicsForm& form = start();
+    std::vector<std::string> failure = shown();
+    ASSERT_EQ(failure.size(), 1u);
+    EXPECT_THAT(failure[0], HasSubstr("תקלה: Cannot read the picture database"));
+    EXPECT_THAT(failure[0], HasSubstr("not a picture database: it is not an SQLite database"));
+    EXPECT_EQ(form.ItemPicLines.Rows(), 1);
+}
+
+TEST_F(ItemPicsFormTest, TheControlGivesTheLinesOfADocumentTheirPictures) {
+    nlohmann::json description = {
+        {"items",
+         {{{"key", "A100"}, {"name", "x"}, {"category", "001"}},
+          {{"key", "B200"}, {"name", "y"}, {"category", "02"}}}},
+        {"documents",
+         {test::Doc(20, "1", "c",
+                    {test::Line("A100", "a"), test::Line("B200", "b"), test::Line("C300", "c")})}}};
+    test::TestCompany company(description.dump());
+    db.create(false);
+    db.replaceAll({R({}, {}, "001", "001", "one.jpg"), R("B", {}, {}, {}, "b.jpg")});
+    start();
+    int16_t type = 20;
+    int32_t first = 2;
+    ASSERT_EQ(card->ShowDoc(company.compPath(), type, first), 0);
+    std::string compPath = company.compPath();
+    card->ReadITM(compPath);
+    std::string dbName = dbDir + "Dovrel.def";
+    card->FillPicPath(dbName);
+    const CurrentDocument& doc = state.Doc;
+    ASSERT_EQ(doc.lineCount, 3);
+    EXPECT_EQ(doc.lines[1].picFile, "one.jpg" + std::string(43, ' '));
+    EXPECT_EQ(doc.lines[2].picFile, "b.jpg" + std::string(45, ' '));
+    EXPECT_EQ(doc.lines[3].picFile, std::string(50, ' ')); // not in the items file
+}
+
+} // namespace
+} // namespace dovrel
