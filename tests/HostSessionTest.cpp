@@ -250,5 +250,55 @@ TEST_F(HostSessionTest, AnswersAndClipboard) {
     EXPECT_EQ(ask({"clipboard"})["result"], "טלפון 03");
 }
 
+TEST_F(HostSessionTest, TheChooserAndTheAccountWindowAreScripted) {
+    test::TempDir main;
+    json named = json::parse(kCompany);
+    named["company"]["name"] = "דמו";
+    sample::WriteCompany(named, main.path() / "comp01");
+    sample::WriteCompany(R"({"company": {"name": "אחרת"}})", main.path() / "comp02");
+    std::string dir = main.str();
+    ask({"modal", "frmOpenDir",
+         {{"set", "frmOpenDir.MainDir", dir},
+          {"click", "frmOpenDir.cmdFindWizComp"},
+          {"select", "frmOpenDir.cmbCompany", 1},
+          {"click", "frmOpenDir.OKButton"}}});
+    json chosen = ask({"click", "CmdDir"});
+    ASSERT_EQ(chosen["ok"], true) << chosen;
+    EXPECT_EQ(chosen["state"]["CompDir"], dir + "/comp01");
+    json list = chosen["state"]["forms"]["frmOpenDir"]["controls"]["cmbCompany"];
+    EXPECT_EQ(list["entries"], json::parse(R"(["אחרת", "דמו"])"));
+    EXPECT_EQ(list["index"], 1);
+    EXPECT_EQ(ask({"get", "frmOpenDir.MainDir"})["value"], dir);
+
+    ask({"set", "txtAccountKey", "1001"});
+    ask({"modal", "frmAccDetails",
+         {{"select", "frmAccDetails.txtPhone", 3, 100}, {"click", "frmAccDetails.cmdCopyText", 0}}});
+    json copied = ask({"click", "cmdAccount"});
+    ASSERT_EQ(copied["ok"], true) << copied;
+    EXPECT_EQ(copied["state"]["forms"]["frmAccDetails"]["controls"]["txtDistrict"], "מרכז");
+    EXPECT_EQ(copied["state"]["forms"]["frmAccDetails"]["selections"]["txtPhone"],
+              json::parse(R"({"start": 3, "length": 7})"));
+    EXPECT_EQ(ask({"clipboard"})["result"], "1234567");
+    // Copying an emptied box shows the message; the window stays until closed.
+    ask({"modal", "frmAccDetails",
+         {{"set", "frmAccDetails.txtDetails", ""}, {"click", "frmAccDetails.cmdCopyText", 1}}});
+    json empty = ask({"click", "cmdAccount"});
+    ASSERT_EQ(empty["messages"].size(), 1u);
+    EXPECT_EQ(empty["messages"][0]["text"], "לא נמצא טקסט להעתקה");
+
+    const std::pair<json, const char*> bad[] = {
+        {{"select", "frmOpenDir.Msg1", 1}, "cannot be selected"},
+        {{"select", "frmAccDetails.txtPhone", 1}, "takes 3 arguments"},
+        {{"select", "frmAccDetails.txtPhone", -1, 2}, "selection start"},
+        {{"click", "CmdDir", 1}, "not a control array"},
+        {{"click", "frmAccDetails.cmdCopyText", 5}, "Unknown control: frmAccDetails.cmdCopyText(5)"},
+        {{"click", "frmAccDetails.cmdCopyText", 0}, "not shown"}};
+    for (const auto& [request, words] : bad) {
+        json reply = ask(request);
+        EXPECT_EQ(reply["ok"], false) << request;
+        EXPECT_NE(reply.value("error", "").find(words), std::string::npos) << reply;
+    }
+}
+
 } // namespace
 } // namespace dovrel

@@ -63,6 +63,31 @@ void CardMembers::SetControl(Control& control, const nlohmann::json& value) {
     }
 }
 
+void CardMembers::Select(Card& card, const std::string& name, const HostArgs& args) {
+    Control& control = Find(card, name);
+    switch (control.kind()) {
+    case ControlKind::ComboBox:
+    case ControlKind::ListBox:
+    case ControlKind::DriveList:
+        args.expectCount(2);
+        static_cast<ComboBox&>(control).setListIndex(
+            static_cast<int32_t>(args.integer(1, "list position", -1, kInt32Max)));
+        return;
+    case ControlKind::TextBox: {
+        args.expectCount(3);
+        auto& box = static_cast<TextBox&>(control);
+        auto start = static_cast<int32_t>(args.integer(1, "selection start", 0, kInt32Max));
+        auto length = static_cast<int32_t>(args.integer(2, "selection length", 0, kInt32Max));
+        box.setSelLength(0);
+        box.setSelStart(start);
+        box.setSelLength(length);
+        return;
+    }
+    default:
+        throw Error(name + " cannot be selected");
+    }
+}
+
 nlohmann::json CardMembers::Get(Card& card, const std::string& name) {
     if (name == "PubACTLocation")
         return card.PubACTLocation;

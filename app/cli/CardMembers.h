@@ -1,5 +1,6 @@
 #pragma once
 
+#include "app/cli/HostArgs.h"
 #include "control/Card.h"
 
 #include <string>
@@ -19,6 +20,9 @@ public:
     static void Set(Card& card, const std::string& name, const nlohmann::json& value);
     static nlohmann::json Get(Card& card, const std::string& name);
     static void SetControl(Control& control, const nlohmann::json& value);
+    // ["select", NAME, INDEX] picks the entry of a list; ["select", NAME,
+    // START, LENGTH] selects part of a text box's text.
+    static void Select(Card& card, const std::string& name, const HostArgs& args);
     // The control of the card, or of a loaded form for "FORM.CONTROL".
     static Control& Find(Card& card, const std::string& name);
     // The loaded form of that name.

@@ -3,6 +3,7 @@
 #include "app/cli/CardMembers.h"
 #include "app/cli/StateJson.h"
 #include "control/CardInterface.h"
+#include "forms/FormDesigns.h"
 #include "fixfiles/AccountsFile.h"
 #include "fixfiles/CompanyFile.h"
 #include "fixfiles/TextDecoding.h"
@@ -178,11 +179,20 @@ void HostSession::addCardCommands() {
 void HostSession::addEventCommands() {
     using Event = void (Card::*)(const std::string&);
     using FormEvent = void (Form::*)(const std::string&);
+    // ["click", CONTROL] or, for an element of a form's control array,
+    // ["click", "FORM.ARRAY", INDEX].
     auto event = [this](const char* name, Event onCard, FormEvent onForm) {
         addCommand(name, [onCard, onForm](HostSession& session, const HostArgs& args) {
-            args.expectCount(1);
+            if (args.size() != 2)
+                args.expectCount(1);
             std::string target = args.text(0, "control");
             size_t dot = target.find('.');
+            if (args.size() == 2) {
+                if (dot == std::string::npos)
+                    throw Error(target + " is not a control array of a form");
+                target = ArrayElementName(target, static_cast<int32_t>(args.integer(
+                                                      1, "index", 0, kInt16Max)));
+            }
             if (dot == std::string::npos) {
                 (session.card().*onCard)(target);
             } else {
@@ -216,6 +226,12 @@ void HostSession::addEventCommands() {
         }
         for (const json& answer : answers)
             session.messages().queueAnswer(answer == "yes" ? MsgAnswer::Yes : MsgAnswer::No);
+        return json::object();
+    });
+    addCommand("select", [](HostSession& session, const HostArgs& args) {
+        if (args.size() != 3)
+            args.expectCount(2);
+        CardMembers::Select(session.card(), args.text(0, "control"), args);
         return json::object();
     });
     addCommand("clipboard", [](HostSession& session, const HostArgs& args) {
