@@ -1,0 +1,94 @@
+#include "app/qt/CardWidget.h"
+
+#include "app/qt/QtText.h"
+#include "platform/Encoding.h"
+#include "platform/Error.h"
+
+#include <QFontDatabase>
+
+namespace dovrel {
+
+CardWidget::CardWidget(const CardServices& services, ModuleState& shared, QWidget* parent)
+    : QWidget(parent), card_(std::make_unique<Card>(services, shared)) {
+    setLayoutDirection(Qt::RightToLeft);
+    setFont(SurfaceFont());
+    setAutoFillBackground(true);
+    bindSurface();
+}
+
+// The widgets go first: they show the control's models to the last.
+CardWidget::~CardWidget() {
+    const QObjectList children = this->children();
+    qDeleteAll(children);
+}
+
+QFont CardWidget::SurfaceFont() {
+    QStringList families = QFontDatabase::families();
+    QString family = QString::fromLatin1(kCardFont);
+    if (!families.contains(family)) {
+        for (const char* fallback :
+             {"Liberation Sans", "DejaVu Sans", "Culmus", "Noto Sans Hebrew"})
+            if (families.contains(QString::fromLatin1(fallback))) {
+                family = QString::fromLatin1(fallback);
+                break;
+            }
+    }
+    QFont font(family);
+    font.setPointSize(8);
+    return font;
+}
+
+QSize CardWidget::sizeHint() const {
+    double scale = ControlBinder::Scale(this);
+    return QSize(ControlBinder::ToPixels(kCardDesignWidth, scale),
+                 ControlBinder::ToPixels(kCardDesignHeight, scale));
+}
+
+void CardWidget::bindSurface() {
+    SurfaceEvents events;
+    events.click = [this](const std::string& name) { card_->Click(name); };
+    events.dblClick = [this](const std::string& name) { card_->DblClick(name); };
+    events.lostFocus = [this](const std::string& name) { card_->LostFocus(name); };
+    events.run = [this](const std::function<void()>& step) { runForUser(step); };
+    binder_ = new ControlBinder(this, std::move(events), this);
+    for (const ControlDesign& design : CardSurface()) {
+        Control* control = card_->findControl(design.name);
+        if (control == nullptr || design.name == "ProgressFill")
+            continue;
+        if (design.name == "ProgressFrame") {
+            progress_ = new ProgressWidget(card_->ProgressFrame, card_->ProgressFill, this);
+            binder_->place(progress_, design);
+            continue;
+        }
+        binder_->bind(*control, design);
+    }
+    resize(sizeHint());
+}
+
+void CardWidget::call(const std::function<void()>& step) {
+    if (depth_ > 0)
+        throw Error("The control is busy: a call cannot start while another one runs");
+    InputHoldScope hold(hold_);
+    ++depth_;
+    progress_->setScanning(true);
+    struct Done {
+        CardWidget& widget;
+        ~Done() {
+            --widget.depth_;
+            widget.progress_->setScanning(false);
+            widget.binder_->refresh();
+        }
+    } done{*this};
+    step();
+}
+
+void CardWidget::runForUser(const std::function<void()>& step) {
+    try {
+        call(step);
+    } catch (const std::exception& failure) {
+        card_->services().messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("תקלה"),
+                                        failure.what());
+    }
+}
+
+} // namespace dovrel

@@ -1,0 +1,254 @@
+#include "QtHost.h"
+
+#include "control/CardInterface.h"
+#include "control/Surface.h"
+
+#include <QFileInfo>
+
+#include <QCheckBox>
+#include <QComboBox>
+#include <QFrame>
+#include <QHeaderView>
+#include <QLabel>
+#include <QLineEdit>
+#include <QTableView>
+#include <QToolButton>
+
+#include <map>
+
+namespace dovrel::test {
+namespace {
+
+using json = nlohmann::json;
+
+constexpr int kDeliveryRow = 13; // type 20, ISHP.FIX
+
+class CardWidgetTest : public QtHost {
+protected:
+    void writeCompany() {
+        company = std::make_unique<TestCompany>(json{
+            {"documents",
+             {Doc(20, "101", "כהן שיפוצים", {Line("A100", "ברגים"), Line("B200", "פטיש")}),
+              Doc(20, "102", "לוי בנייה", {Line("C300", "מסור")}),
+              Doc(20, "103", "כהן שיפוצים")}}}.dump());
+    }
+    // The company path typed into its box and the delivery notes chosen, as
+    // a user would.
+    void openCompany() {
+        writeCompany();
+        retype(find<QLineEdit>("txtCompPath"), QString::fromStdString(company->path().string()));
+        find<QComboBox>("cmbDocType")->setCurrentIndex(kDeliveryRow);
+    }
+    QString text(const std::string& name) { return find<QLineEdit>(name)->text(); }
+
+    std::unique_ptr<TestCompany> company;
+};
+
+TEST_F(CardWidgetTest, EveryControlOfTheSurfaceHasAWidgetWhereItIsDesigned) {
+    double scale = ControlBinder::Scale(widget.get());
+    std::map<ControlKind, const char*> classes = {
+        {ControlKind::TextBox, "QLineEdit"},  {ControlKind::ComboBox, "QComboBox"},
+        {ControlKind::CheckBox, "QCheckBox"}, {ControlKind::Label, "QLabel"},
+        {ControlKind::Button, "QToolButton"}, {ControlKind::Grid, "QTableView"},
+        {ControlKind::Shape, "QFrame"}};
+    for (const ControlDesign& design : CardSurface()) {
+        if (design.name == "ProgressFill")
+            continue;
+        QWidget* shown = widget->widgetFor(design.name);
+        ASSERT_NE(shown, nullptr) << design.name;
+        EXPECT_EQ(shown->geometry(), QRect(ControlBinder::ToPixels(design.left, scale),
+                                           ControlBinder::ToPixels(design.top, scale),
+                                           ControlBinder::ToPixels(design.width, scale),
+                                           ControlBinder::ToPixels(design.height, scale)))
+            << design.name;
+        EXPECT_EQ(shown->layoutDirection(), Qt::RightToLeft) << design.name;
+        if (design.name != "ProgressFrame") {
+            EXPECT_TRUE(shown->inherits(classes.at(design.kind))) << design.name;
+        }
+        if (!design.labelFor.empty()) { // a caption stands to the right of its field
+            EXPECT_GE(shown->x(), widget->widgetFor(design.labelFor)->geometry().right())
+                << design.name;
+        }
+    }
+    EXPECT_EQ(widget->size(), QSize(ControlBinder::ToPixels(kCardDesignWidth, scale),
+                                    ControlBinder::ToPixels(kCardDesignHeight, scale)));
+    EXPECT_EQ(scale, widget->logicalDpiX() / 1440.0);
+
+    for (const char* name : {"Label1", "Label2", "LblReference1", "lblDetails", "lblItemKey"}) {
+        auto* label = find<QLabel>(name);
+        EXPECT_TRUE(label->font().bold()) << name;
+        EXPECT_EQ(label->palette().color(QPalette::WindowText), QColor(0, 0, 128)) << name;
+    }
+    EXPECT_FALSE(find<QLabel>("Label4")->font().bold());
+    EXPECT_EQ(find<QLabel>("lblItemKey")->text(), Q(":חיפוש מק\"ט"));
+    EXPECT_EQ(find<QLabel>("Label10")->text(), Q(":סה\"כ כולל מע\"מ"));
+    EXPECT_EQ(find<QToolButton>("FirstButt")->text(), Q("הראשון"));
+    EXPECT_EQ(find<QToolButton>("FirstButt")->toolTip(), Q("המסמך הראשון"));
+    EXPECT_EQ(find<QToolButton>("CmdDir")->toolTip(), Q("בחירת חברה"));
+    EXPECT_EQ(find<QCheckBox>("ChkShowTotalFC")->text(), Q("להציג סה\"כ מטח?"));
+    EXPECT_EQ(find<QComboBox>("CmbDocLang")->itemText(2), Q("עברית ללא סכומים"));
+    EXPECT_EQ(find<QComboBox>("cmbDocType")->count(), 26);
+    // The grey boxes have the button face behind their text.
+    QLineEdit* date = find<QLineEdit>("txtDate");
+    EXPECT_EQ(date->palette().color(QPalette::Base), date->palette().color(QPalette::Button));
+    EXPECT_NE(text("txtCompPath"), QString());
+
+    // A fresh grid: the heading of eight columns and one empty row.
+    auto* lines = find<QTableView>("DocLines");
+    ASSERT_EQ(lines->model()->columnCount(), 8);
+    EXPECT_EQ(lines->model()->rowCount(), 1);
+    EXPECT_EQ(lines->model()->headerData(0, Qt::Horizontal).toString(), Q("שורה"));
+    EXPECT_EQ(lines->model()->headerData(7, Qt::Horizontal).toString().trimmed(), Q("סהכ שח"));
+    EXPECT_GT(lines->columnWidth(2), lines->columnWidth(0)); // "תאור" has 70 spaces
+}
+
+TEST_F(CardWidgetTest, ClicksRunTheControlsHandlersAndTheBoxesShowTheDocument) {
+    openCompany();
+    EXPECT_EQ(card().shared().CompDir, company->compPath());
+    EXPECT_EQ(card().cmbDocType.ListIndex(), kDeliveryRow);
+
+    click("FirstButt");
+    EXPECT_EQ(text("txtReference1").trimmed(), "101");
+    EXPECT_EQ(text("txtCustomerName").trimmed(), Q("כהן שיפוצים"));
+    auto* lines = find<QTableView>("DocLines");
+    ASSERT_EQ(lines->model()->rowCount(), 3);
+    EXPECT_EQ(lines->model()->index(1, 1).data().toString().trimmed(), "B200");
+    EXPECT_EQ(lines->model()->index(1, 2).data().toString().trimmed(), Q("פטיש"));
+    EXPECT_EQ(lines->model()->index(2, 1).data().toString(), "");
+
+    click("NextButt");
+    EXPECT_EQ(text("txtReference1").trimmed(), "102");
+    EXPECT_EQ(lines->model()->rowCount(), 2);
+    click("LastButt");
+    EXPECT_EQ(text("txtReference1").trimmed(), "103");
+    click("PrevButt");
+    EXPECT_EQ(text("txtReference1").trimmed(), "102");
+
+    // A double click on the name's label searches by name; a single click on
+    // it does nothing.
+    retype(find<QLineEdit>("txtCustomerName"), Q("כהן שיפוצים"));
+    click("Label2");
+    EXPECT_EQ(card().PubSearchBy, "");
+    doubleClick("Label2");
+    EXPECT_EQ(card().PubSearchBy, "CustomerName");
+    EXPECT_EQ(text("txtReference1").trimmed(), "101");
+    click("NextButt");
+    EXPECT_EQ(text("txtReference1").trimmed(), "103");
+
+    // A single click on the details label searches.
+    retype(find<QLineEdit>("txtDetails"), "zzz");
+    click("lblDetails");
+    EXPECT_EQ(card().PubSearchBy, "Details");
+    EXPECT_EQ(text("txtReference1"), "");
+    EXPECT_TRUE(boxes.empty());
+}
+
+TEST_F(CardWidgetTest, ModelChangesReachTheirWidgets) {
+    card().txtTitle.setText(W("כותרת חדשה"));
+    EXPECT_EQ(text("txtTitle"), Q("כותרת חדשה"));
+    card().ChkWithDrawing.setValue(1);
+    EXPECT_EQ(find<QCheckBox>("ChkWithDrawing")->checkState(), Qt::Checked);
+    card().chkLineDisc.setValue(2);
+    EXPECT_EQ(find<QCheckBox>("chkLineDisc")->checkState(), Qt::PartiallyChecked);
+    card().cmbRules.setListIndex(2);
+    EXPECT_EQ(find<QComboBox>("cmbRules")->currentIndex(), 2);
+    card().DocLines.AddItem("1\tA", 1);
+    EXPECT_EQ(find<QTableView>("DocLines")->model()->rowCount(), 2);
+
+    // And the user's changes reach the models.
+    card().ChkShowDetails.setValue(0);
+    QTest::mouseClick(find<QCheckBox>("ChkShowDetails"), Qt::LeftButton);
+    EXPECT_EQ(card().ChkShowDetails.Value(), 1);
+    find<QComboBox>("CmbDocLang")->setCurrentIndex(1);
+    EXPECT_EQ(card().CmbDocLang.ListIndex(), 1);
+
+    // Leaving the language list on English puts the English title into the
+    // title box, replacing what was typed.
+    find<QComboBox>("cmbDocType")->setCurrentIndex(kDeliveryRow);
+    QWidget* lang = find("CmbDocLang");
+    lang->setFocus();
+    find("txtTitle")->setFocus();
+    EXPECT_EQ(text("txtTitle"), ToQString(card().shared().DocTypes[kDeliveryRow].englishTitle));
+}
+
+TEST_F(CardWidgetTest, MessageBoxesCarryTheExactTitleTextIconAndButtons) {
+    TempDir empty;
+    retype(find<QLineEdit>("txtCompPath"), QString::fromStdString(empty.str()));
+    click("FirstButt");
+    ASSERT_EQ(boxes.size(), 1u);
+    EXPECT_EQ(boxes[0].title, Q("שגיאה"));
+    EXPECT_EQ(boxes[0].text, Q("קבצי מסמכים לא נמצאו"));
+    EXPECT_EQ(boxes[0].icon, QMessageBox::Critical);
+    EXPECT_EQ(boxes[0].buttons, QMessageBox::StandardButtons(QMessageBox::Ok));
+    EXPECT_EQ(boxes[0].direction, Qt::RightToLeft);
+
+    // A question is answered by the test.
+    answer = QMessageBox::Yes;
+    EXPECT_EQ(messages.show(MsgIcon::Question, MsgButtons::YesNo, W("שימו לב"), W("האם למחוק?")),
+              MsgAnswer::Yes);
+    answer = QMessageBox::No;
+    EXPECT_EQ(messages.show(MsgIcon::Question, MsgButtons::YesNo, W("שימו לב"), W("האם למחוק?")),
+              MsgAnswer::No);
+    ASSERT_EQ(boxes.size(), 3u);
+    EXPECT_EQ(boxes[2].title, Q("שימו לב"));
+    EXPECT_EQ(boxes[2].icon, QMessageBox::Question);
+    EXPECT_EQ(boxes[2].buttons, QMessageBox::Yes | QMessageBox::No);
+}
+
+TEST_F(CardWidgetTest, PrintAsksTheBrowserToOpenThePage) {
+    openCompany();
+    click("FirstButt");
+    click("PrintButt");
+    ASSERT_EQ(opened.size(), 1u) << (boxes.empty() ? "" : boxes[0].text.toStdString());
+    EXPECT_TRUE(opened[0].isLocalFile());
+    EXPECT_TRUE(QFileInfo::exists(opened[0].toLocalFile()));
+}
+
+TEST_F(CardWidgetTest, MembersCanBeCalledByName) {
+    writeCompany();
+    const QMetaObject* meta = object->metaObject();
+    for (const CardInterface::Member& member : CardInterface::Members()) {
+        if (member.isProperty) {
+            EXPECT_GE(meta->indexOfProperty(member.name), 0) << member.name;
+            continue;
+        }
+        int found = -1;
+        for (int i = meta->methodOffset(); i < meta->methodCount(); ++i)
+            if (meta->method(i).name() == member.name)
+                found = i;
+        ASSERT_GE(found, 0) << member.name;
+        EXPECT_EQ(meta->method(found).parameterCount(), static_cast<int>(member.params.size()))
+            << member.name;
+        for (size_t p = 0; p < member.params.size(); ++p)
+            EXPECT_EQ(meta->method(found).parameterNames()[static_cast<int>(p)],
+                      member.params[p].name)
+                << member.name;
+    }
+
+    int result = -1;
+    QString compPath = QString::fromStdString(company->path().string());
+    ASSERT_TRUE(QMetaObject::invokeMethod(object.get(), "ShowDoc", Q_RETURN_ARG(int, result),
+                                          Q_ARG(QString, compPath), Q_ARG(short, 20),
+                                          Q_ARG(int, 5)));
+    EXPECT_EQ(result, 0);
+    EXPECT_EQ(text("txtReference1").trimmed(), "102");
+    EXPECT_EQ(object->property("ACTLocation").toInt(), card().PubACTLocation);
+    EXPECT_EQ(object->property("SetCompDir").toString(), compPath);
+
+    EXPECT_TRUE(object->setProperty("ACTLocation", 10.5));
+    EXPECT_EQ(object->property("PubACTLocation").toInt(), 10);
+    EXPECT_TRUE(object->setProperty("SetAccountKey", Q("אבג")));
+    EXPECT_EQ(text("txtAccountKey"), Q("אבג"));
+    EXPECT_TRUE(object->property("lastError").toString().isEmpty());
+
+    // A failure is the call's error, not the end of the program.
+    object->setProperty("ACTLocation", Q("not a number"));
+    EXPECT_FALSE(object->lastError().isEmpty());
+    EXPECT_EQ(card().PubACTLocation, 10);
+    QString rules;
+    QMetaObject::invokeMethod(object.get(), "RulesValue", Q_RETURN_ARG(QString, rules));
+    EXPECT_TRUE(object->lastError().isEmpty());
+}
+
+} // namespace
+} // namespace dovrel::test
