@@ -1,4 +1,5 @@
 #include "app/cli/HostSession.h"
+#include "app/cli/PrintCommand.h"
 #include "app/cli/SettingsCommand.h"
 #include "app/cli/ShowCommand.h"
 #include "app/cli/Subcommands.h"
@@ -37,15 +38,18 @@ void AddShow(CLI::App& app, Runner& run) {
 }
 
 void AddHost(CLI::App& app, Runner& run) {
+    auto today = std::make_shared<std::string>();
     CLI::App* host = app.add_subcommand(
         "host", "Automation: one JSON request per input line, one JSON answer per output line");
-    host->callback(
-        [&run] {
-            run = [] {
-                dovrel::HostSession session(std::make_unique<dovrel::SqliteSettingsStore>());
-                return session.serve(std::cin, std::cout);
-            };
-        });
+    host->add_option("--today", *today, "Today's date on printed pages, YYYY-MM-DD");
+    host->callback([today, &run] {
+        run = [today] {
+            dovrel::HostSession session(std::make_unique<dovrel::SqliteSettingsStore>());
+            if (!today->empty())
+                session.setToday(dovrel::PrintCommand::ParseDay(*today));
+            return session.serve(std::cin, std::cout);
+        };
+    });
 }
 
 void AddSettings(CLI::App& app, Runner& run) {
