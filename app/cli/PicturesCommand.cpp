@@ -1,0 +1,254 @@
+#include "app/cli/PicturesCommand.h"
+
+#include "pictures/PictureLookup.h"
+#include "platform/Encoding.h"
+#include "platform/Error.h"
+#include "platform/FileSystem.h"
+
+#include <nlohmann/json.hpp>
+
+#include <charconv>
+#include <fstream>
+#include <ostream>
+#include <sstream>
+#include <utility>
+
+namespace dovrel {
+
+namespace {
+
+constexpr const char* kFields[] = {"FromItemKey", "ToItemKey", "FromCatCode", "ToCatCode",
+                                   "PicFile"};
+
+std::optional<std::string> PictureRange::*const kMembers[] = {
+    &PictureRange::FromItemKey, &PictureRange::ToItemKey, &PictureRange::FromCatCode,
+    &PictureRange::ToCatCode, &PictureRange::PicFile};
+
+std::optional<std::string> NullWhenEmpty(const std::string& text) {
+    return text.empty() ? std::nullopt : std::optional<std::string>(text);
+}
+
+// A range from the five texts as the settings form takes its cells: an empty
+// lower bound is open, the rest is kept as typed (so an empty one is refused).
+PictureRange RangeOfCells(const std::vector<std::string>& utf8) {
+    PictureRange range;
+    for (size_t i = 0; i < 5; ++i)
+        range.*kMembers[i] = FromUtf8(utf8[i]);
+    range.FromItemKey = NullWhenEmpty(*range.FromItemKey);
+    range.FromCatCode = NullWhenEmpty(*range.FromCatCode);
+    return range;
+}
+
+std::string CsvField(const std::string& utf8) {
+    if (utf8.find_first_of(",\"\r\n") == std::string::npos)
+        return utf8;
+    std::string quoted = "\"";
+    for (char c : utf8)
+        quoted += c == '"' ? std::string("\"\"") : std::string(1, c);
+    return quoted + '"';
+}
+
+// The records of a CSV text: fields separated by commas, quoted with '"' when
+// they hold commas, quotes or line ends; CR LF or LF ends a record.
+std::vector<std::vector<std::string>> ParseCsv(const std::string& text) {
+    std::vector<std::vector<std::string>> records(1, std::vector<std::string>(1));
+    bool quoted = false;
+    for (size_t i = 0; i < text.size(); ++i) {
+        char c = text[i];
+        std::string& field = records.back().back();
+        if (quoted) {
+            if (c == '"' && i + 1 < text.size() && text[i + 1] == '"')
+                field += text[++i];
+            else if (c == '"')
+                quoted = false;
+            else
+                field += c;
+        } else if (c == '"') {
+            quoted = true;
+        } else if (c == ',') {
+            records.back().emplace_back();
+        } else if (c == '\n' || (c == '\r' && i + 1 < text.size() && text[i + 1] == '\n')) {
+            i += c == '\r' ? 1 : 0;
+            records.emplace_back(1);
+        } else {
+            field += c;
+        }
+    }
+    if (quoted)
+        throw Error("The CSV text ends inside a quoted field");
+    if (records.back() == std::vector<std::string>(1))
+        records.pop_back(); // the final line end
+    return records;
+}
+
+int32_t ParseRangeId(const std::string& text) {
+    int32_t value = 0;
+    auto [end, ec] = std::from_chars(text.data(), text.data() + text.size(), value);
+    if (ec != std::errc() || end != text.data() + text.size())
+        throw Error("Not a range number: " + text);
+    return value;
+}
+
+} // namespace
+
+PicturesCommand::PicturesCommand(PicturesOptions options, SettingsStore& store)
+    : options_(std::move(options)), store_(store) {}
+
+std::string PicturesCommand::dbName(std::ostream& err) {
+    if (!options_.db.empty()) {
+        std::string dir = FromUtf8(options_.db);
+        if (dir.back() != '/' && dir.back() != '\\')
+            dir += '/';
+        return dir + PictureDb::kFileName;
+    }
+    std::string dir = store_.GetSetting(FromUtf8(options_.app), "Params", "DBPath", "c:\\");
+    if (dir.empty() || SettingsStore::FoldCase(dir) == "c:\\") {
+        err << "No picture folder is set: give one with --db DIR, or save DBPath in the picture "
+               "settings (dovrel settings set DBPath DIR/)\n";
+        return "";
+    }
+    return dir + PictureDb::kFileName;
+}
+
+int PicturesCommand::run(std::ostream& out, std::ostream& err) {
+    std::string name = dbName(err);
+    if (name.empty())
+        return 1;
+    PictureDb db(name);
+    const std::string& action = options_.action;
+    if (action == "init")
+        return init(db, out);
+    if (action != "import" && !FileExists(name)) {
+        err << "There is no picture database at " << ResolvePath(name)
+            << " (dovrel pictures init makes one)\n";
+        return 1;
+    }
+    if (action == "list")
+        return list(db, out);
+    if (action == "add")
+        return add(db, out);
+    if (action == "delete")
+        return remove(db, err);
+    if (action == "which")
+        return which(db, out, err);
+    if (action == "export")
+        return exportTo(db, out);
+    if (action == "import")
+        return importFrom(db, out);
+    throw Error("Unknown pictures action: " + action);
+}
+
+void PicturesCommand::needArgs(size_t count, const char* usage) const {
+    if (options_.args.size() != count)
+        throw Error(std::string("Usage: dovrel pictures ") + usage);
+}
+
+int PicturesCommand::init(const PictureDb& db, std::ostream& out) {
+    PictureDb::Inspection old = db.inspect();
+    if (old.kind == PictureDb::FileKind::Foreign && !options_.force)
+        throw Error("The file " + ResolvePath(db.path()) + " is not a picture database (" +
+                    old.reason + "); it was left as it is. Give --force to replace it");
+    db.create(options_.force);
+    out << "Created an empty picture database at " << ResolvePath(db.path()) << '\n';
+    return 0;
+}
+
+int PicturesCommand::list(const PictureDb& db, std::ostream& out) const {
+    std::vector<PictureRange> ranges = db.rangesById();
+    if (options_.json) {
+        nlohmann::json all = nlohmann::json::array();
+        for (const PictureRange& range : ranges) {
+            nlohmann::json row = {{"RangeID", range.RangeID}};
+            for (size_t i = 0; i < 5; ++i) {
+                const std::optional<std::string>& value = range.*kMembers[i];
+                row[kFields[i]] = value ? nlohmann::json(ToUtf8(*value)) : nlohmann::json();
+            }
+            all.push_back(row);
+        }
+        out << all.dump(2) << '\n';
+        return 0;
+    }
+    out << "RangeID\tFromItemKey\tToItemKey\tFromCatCode\tToCatCode\tPicFile\n";
+    for (const PictureRange& range : ranges) {
+        out << range.RangeID;
+        for (auto member : kMembers)
+            out << '\t' << ToUtf8((range.*member).value_or(""));
+        out << '\n';
+    }
+    return 0;
+}
+
+int PicturesCommand::add(const PictureDb& db, std::ostream& out) const {
+    const std::vector<std::string>& a = options_.args;
+    if (a.size() != 3 && a.size() != 5)
+        throw Error("Usage: dovrel pictures add FROMKEY TOKEY [FROMCAT TOCAT] PICFILE");
+    PictureRange range = a.size() == 5 ? RangeOfCells(a) : RangeOfCells({a[0], a[1], "", "", a[2]});
+    if (a.size() == 3)
+        range.ToCatCode.reset(); // no category bounds at all
+    out << "Added range " << db.add(range) << '\n';
+    return 0;
+}
+
+int PicturesCommand::remove(const PictureDb& db, std::ostream& err) const {
+    needArgs(1, "delete RANGEID");
+    int32_t rangeId = ParseRangeId(options_.args[0]);
+    if (db.remove(rangeId))
+        return 0;
+    err << "No range " << rangeId << " in " << ResolvePath(db.path()) << '\n';
+    return 1;
+}
+
+// A line's category code is three characters, as stored.
+int PicturesCommand::which(const PictureDb& db, std::ostream& out, std::ostream& err) const {
+    needArgs(2, "which ITEMKEY CATCODE");
+    std::string key = FromUtf8(options_.args[0]);
+    std::string code = FromUtf8(options_.args[1]).substr(0, PictureDb::kCodeSize);
+    code.resize(PictureDb::kCodeSize, ' ');
+    PictureLookup lookup(db.rangesInLookupOrder());
+    if (const std::string* picture = lookup.pictureFor(key, code)) {
+        out << ToUtf8(*picture) << '\n';
+        return 0;
+    }
+    err << "No picture for item " << options_.args[0] << " with category code \""
+        << options_.args[1] << "\"\n";
+    return 1;
+}
+
+int PicturesCommand::exportTo(const PictureDb& db, std::ostream& out) const {
+    needArgs(1, "export FILE.csv");
+    std::ostringstream csv;
+    csv << "FromItemKey,ToItemKey,FromCatCode,ToCatCode,PicFile\r\n";
+    for (const PictureRange& range : db.rangesById()) {
+        for (size_t i = 0; i < 5; ++i)
+            csv << (i ? "," : "") << CsvField(ToUtf8((range.*kMembers[i]).value_or("")));
+        csv << "\r\n";
+    }
+    std::ofstream file(options_.args[0], std::ios::binary | std::ios::trunc);
+    if (!(file << csv.str()) || !file.flush())
+        throw Error("Cannot write " + options_.args[0]);
+    out << "Wrote the picture ranges to " << options_.args[0] << '\n';
+    return 0;
+}
+
+int PicturesCommand::importFrom(const PictureDb& db, std::ostream& out) const {
+    needArgs(1, "import FILE.csv");
+    std::ifstream file(options_.args[0], std::ios::binary);
+    if (!file)
+        throw Error("Cannot read " + options_.args[0]);
+    std::vector<std::vector<std::string>> records =
+        ParseCsv({std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>()});
+    if (!records.empty() && records.front().size() == 5 && records.front()[0] == kFields[0])
+        records.erase(records.begin()); // the heading
+    std::vector<PictureRange> ranges;
+    for (size_t i = 0; i < records.size(); ++i) {
+        if (records[i].size() != 5)
+            throw Error(options_.args[0] + ": record " + std::to_string(i + 1) + " has " +
+                        std::to_string(records[i].size()) + " fields, not 5; nothing was changed");
+        ranges.push_back(RangeOfCells(records[i]));
+    }
+    db.replaceAll(ranges);
+    out << "Imported " << ranges.size() << " picture ranges\n";
+    return 0;
+}
+
+} // namespace dovrel
