@@ -24,16 +24,18 @@ CardWidget::~CardWidget() {
 
 QFont CardWidget::SurfaceFont() {
     QStringList families = QFontDatabase::families();
-    QString family = QString::fromLatin1(kCardFont);
-    if (!families.contains(family)) {
-        for (const char* fallback :
-             {"Liberation Sans", "DejaVu Sans", "Culmus", "Noto Sans Hebrew"})
+    QFont font(QString::fromLatin1(kCardFont));
+    if (!families.contains(font.family())) {
+        // Arial's own metrics, or a narrower cut of a wider font, so the
+        // captions fit the places designed for them.
+        for (const char* fallback : {"Liberation Sans", "Noto Sans Hebrew", "DejaVu Sans"})
             if (families.contains(QString::fromLatin1(fallback))) {
-                family = QString::fromLatin1(fallback);
+                font.setFamily(QString::fromLatin1(fallback));
                 break;
             }
+        if (font.family() == QLatin1String("DejaVu Sans"))
+            font.setStretch(QFont::SemiCondensed);
     }
-    QFont font(family);
     font.setPointSize(8);
     return font;
 }

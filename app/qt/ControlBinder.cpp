@@ -298,7 +298,9 @@ QWidget* ControlBinder::draw(const ControlDesign& design) {
 QWidget* ControlBinder::makeLabel(const Control* label, const ControlDesign& design) {
     auto* text =
         new QLabel(ToQString(label != nullptr ? label->Caption() : design.caption), surface_);
-    text->setAlignment(Qt::AlignRight | Qt::AlignAbsolute | Qt::AlignVCenter);
+    // A caption keeps close to the field it names, which stands to its left.
+    Qt::Alignment side = design.labelFor.empty() ? Qt::AlignRight : Qt::AlignLeft;
+    text->setAlignment(side | Qt::AlignAbsolute | Qt::AlignVCenter);
     if (design.bold) {
         QFont font = text->font();
         font.setBold(true);
