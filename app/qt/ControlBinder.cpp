@@ -155,20 +155,37 @@ QWidget* ControlBinder::makeTextBox(TextBox& box, const ControlDesign& design) {
     }
     follow(box, [edit, &box, this] {
         QString text = ToQString(box.Text());
-        if (edit->text() != text) {
-            ++syncing_;
+        ++syncing_;
+        if (edit->text() != text)
             edit->setText(text);
-            --syncing_;
-        }
+        if (box.SelLength() > 0 && (edit->selectionStart() != box.SelStart() ||
+                                    edit->selectedText().size() != box.SelLength()))
+            edit->setSelection(box.SelStart(), box.SelLength());
+        --syncing_;
     });
     connect(edit, &QLineEdit::textEdited, this, [this, edit, &box](const QString& text) {
         user([&] { box.setText(FromQString(text)); });
         QString stored = ToQString(box.Text());
         if (edit->text() != stored)
             edit->setText(stored);
+        selectionToModel(edit, box);
     });
+    connect(edit, &QLineEdit::selectionChanged, this,
+            [this, edit, &box] { selectionToModel(edit, box); });
+    connect(edit, &QLineEdit::cursorPositionChanged, this,
+            [this, edit, &box] { selectionToModel(edit, box); });
     watch(edit, design.name);
     return edit;
+}
+
+// Each character of the core's code page is one byte there and one unit of
+// Qt's strings, so the positions carry over as they are.
+void ControlBinder::selectionToModel(QLineEdit* edit, TextBox& box) {
+    if (syncing_ > 0 || edit->text() != ToQString(box.Text()))
+        return;
+    bool selected = edit->hasSelectedText();
+    box.setSelStart(selected ? edit->selectionStart() : edit->cursorPosition());
+    box.setSelLength(selected ? static_cast<int32_t>(edit->selectedText().size()) : 0);
 }
 
 QWidget* ControlBinder::makeComboBox(ComboBox& list, const ControlDesign& design) {

@@ -11,6 +11,7 @@
 #include <string>
 #include <vector>
 
+class QLineEdit;
 class QWidget;
 
 namespace dovrel {
@@ -58,6 +59,7 @@ protected:
 
 private:
     QWidget* makeTextBox(TextBox& box, const ControlDesign& design);
+    void selectionToModel(QLineEdit* edit, TextBox& box);
     QWidget* makeComboBox(ComboBox& list, const ControlDesign& design);
     QWidget* makeCheckBox(CheckBox& check, const ControlDesign& design);
     QWidget* makeLabel(const Control* label, const ControlDesign& design);

@@ -87,6 +87,7 @@ protected:
     // Replaces a text box's text as a user would: everything selected, then typed.
     static void retype(QLineEdit* box, const QString& text) {
         box->selectAll();
+        QTest::keyClick(box, Qt::Key_Backspace);
         type(box, text);
     }
     void doubleClick(const std::string& name) {

@@ -1,0 +1,155 @@
+#include "QtHost.h"
+
+#include "forms/OpenDirForm.h"
+
+#include <QComboBox>
+#include <QFileSystemModel>
+#include <QLabel>
+#include <QListWidget>
+#include <QTableView>
+#include <QToolButton>
+#include <QTreeView>
+
+namespace dovrel::test {
+namespace {
+
+using json = nlohmann::json;
+
+// The three side forms as dialogs, worked by the test while they are shown.
+class FormDialogTest : public QtHost {
+protected:
+    template <typename W = QWidget> static W* in(FormDialog& dialog, const std::string& name) {
+        auto* found = qobject_cast<W*>(dialog.widgetFor(name));
+        EXPECT_NE(found, nullptr) << name;
+        return found;
+    }
+    static void press(FormDialog& dialog, const std::string& name) {
+        QTest::mouseClick(dialog.widgetFor(name), Qt::LeftButton);
+    }
+    // Shows the dialog the control opens on a click and lets the test work it.
+    void open(const std::string& button, std::function<void(FormDialog&)> work) {
+        bool shown = false;
+        workForm = [&](FormDialog& dialog) {
+            shown = true;
+            dialog.show();
+            EXPECT_EQ(dialog.layoutDirection(), Qt::RightToLeft);
+            work(dialog);
+        };
+        click(button);
+        EXPECT_TRUE(shown) << button;
+        workForm = nullptr;
+    }
+};
+
+TEST_F(FormDialogTest, AccountDetailsCopyTheSelectionOrTheWholeBox) {
+    TestCompany company(json{{"accounts",
+                              {{{"key", "1001"},
+                                {"phone", "03-1234567 054-7654321"},
+                                {"district", "מרכז"},
+                                {"details", "לקוח ותיק"}}}}}
+                            .dump());
+    card().txtCompPath.setText(company.compPath());
+    retype(find<QLineEdit>("txtAccountKey"), "1001");
+    open("cmdAccount", [&](FormDialog& dialog) {
+        EXPECT_EQ(dialog.windowTitle(), Q("פרטי כרטיס"));
+        EXPECT_EQ(in<QLabel>(dialog, "Label1")->text(), Q("טלפונים:"));
+        EXPECT_EQ(in<QToolButton>(dialog, "cmdCopyText(2)")->text(), Q("העתק וסגור"));
+        EXPECT_EQ(in<QLineEdit>(dialog, "txtDistrict")->text().trimmed(), Q("מרכז"));
+        auto* phone = in<QLineEdit>(dialog, "txtPhone");
+        ASSERT_TRUE(phone->text().startsWith("03-1234567"));
+        phone->setSelection(0, 10);
+        press(dialog, "cmdCopyText(0)");
+        EXPECT_FALSE(dialog.form().Visible());
+    });
+    EXPECT_EQ(clipboard.GetText(), "03-1234567");
+
+    open("cmdAccount", [&](FormDialog& dialog) {
+        retype(in<QLineEdit>(dialog, "txtDetails"), "");
+        press(dialog, "cmdCopyText(1)");
+        EXPECT_TRUE(dialog.form().Visible()); // nothing to copy: the window stays
+        press(dialog, "cmdCopyText(2)");
+        EXPECT_FALSE(dialog.form().Visible());
+    });
+    EXPECT_EQ(U(clipboard.GetText()), "מרכז");
+    ASSERT_EQ(boxes.size(), 1u);
+    EXPECT_EQ(boxes[0].title, Q("שגיאה"));
+    EXPECT_EQ(boxes[0].text, Q("לא נמצא טקסט להעתקה"));
+}
+
+TEST_F(FormDialogTest, TheCompanyChooserScansTheChosenDirectoryAndReturnsTheCompany) {
+    TempDir main;
+    for (auto [dir, name] : {std::pair{"comp01", "גמל"}, {"comp02", "אלף"}})
+        sample::WriteCompany(json{{"company", {{"name", name}}}, {"documents", json::array()}},
+                             main.path() / dir);
+    open("CmdDir", [&](FormDialog& dialog) {
+        EXPECT_EQ(dialog.windowTitle(), Q("בחירת מחיצה ראשית"));
+        EXPECT_EQ(in<QComboBox>(dialog, "PathDrive")->itemText(0), "/");
+        press(dialog, "OKButton");
+        ASSERT_EQ(boxes.size(), 1u);
+        EXPECT_EQ(boxes[0].text, Q("לא בחרת חברה"));
+        EXPECT_TRUE(dialog.form().Visible());
+
+        auto* tree = in<QTreeView>(dialog, "MainDir");
+        auto* files = qobject_cast<QFileSystemModel*>(tree->model());
+        ASSERT_NE(files, nullptr);
+        tree->setCurrentIndex(files->index(QString::fromStdString(main.str())));
+        EXPECT_EQ(static_cast<OpenDirForm&>(dialog.form()).MainDir.Path(), W(main.str()));
+        press(dialog, "cmdFindWizComp");
+        auto* list = in<QListWidget>(dialog, "cmbCompany");
+        ASSERT_EQ(list->count(), 2);
+        EXPECT_EQ(list->item(0)->text(), Q("אלף"));
+        EXPECT_EQ(list->item(1)->text(), Q("גמל"));
+        EXPECT_EQ(in<QLabel>(dialog, "Msg1")->text(), Q("הסריקה הסתיימה. תקתוק כפול לבחירה..."));
+        list->setCurrentRow(1);
+        press(dialog, "OKButton");
+        EXPECT_FALSE(dialog.form().Visible());
+    });
+    EXPECT_EQ(find<QLineEdit>("txtCompPath")->text(),
+              QString::fromStdString((main.path() / "comp01").string()));
+    EXPECT_EQ(card().PubACTLocation, 2);
+}
+
+TEST_F(FormDialogTest, ThePictureSettingsFormEditsItsRangesInTheGrid) {
+    TempDir db;
+    open("CmdParams", [&](FormDialog& dialog) {
+        EXPECT_EQ(dialog.windowTitle(), Q("הגדרות נוספות"));
+        EXPECT_EQ(in<QLineEdit>(dialog, "txtCompTitle")->text(),
+                  Q("רחוב הגפן 9, חיפה. טלפון: 04-8123456"));
+        EXPECT_EQ(in<QToolButton>(dialog, "CmdNew")->text(), Q("שורה חדשה"));
+        auto* grid = in<QTableView>(dialog, "ItemPicLines");
+        EXPECT_EQ(grid->model()->columnCount(), 5);
+        EXPECT_EQ(grid->model()->headerData(0, Qt::Horizontal).toString().trimmed(),
+                  Q("ממפתח פריט"));
+
+        press(dialog, "CmdNew"); // no database yet
+        ASSERT_EQ(boxes.size(), 1u);
+        EXPECT_EQ(boxes[0].text, Q("קובץ ההגדרות אינו נמצא"));
+        EXPECT_EQ(grid->model()->rowCount(), 0);
+
+        retype(in<QLineEdit>(dialog, "txtDBPath"), QString::fromStdString(db.str() + "/"));
+        answer = QMessageBox::Yes;
+        press(dialog, "CmdInitDB");
+        ASSERT_EQ(boxes.size(), 3u);
+        EXPECT_EQ(boxes[1].text, Q("האם אתה בטוח?"));
+        EXPECT_EQ(boxes[1].buttons, QMessageBox::Yes | QMessageBox::No);
+        EXPECT_EQ(boxes[2].title, Q("הודעה"));
+        EXPECT_EQ(boxes[2].text, Q("בסיס הנתונים אותחל"));
+        EXPECT_EQ(boxes[2].icon, QMessageBox::Information);
+
+        press(dialog, "CmdNew");
+        ASSERT_EQ(grid->model()->rowCount(), 1);
+        EXPECT_EQ(grid->model()->index(0, 4).data().toString(), "pic001.jpg");
+        // The user types a cell in place; the form's grid has it.
+        grid->model()->setData(grid->model()->index(0, 4), "drill.jpg");
+        EXPECT_EQ(static_cast<Grid&>(*dialog.form().findControl("ItemPicLines")).TextMatrix(1, 4),
+                  "drill.jpg");
+        press(dialog, "CmdUpdate");
+        EXPECT_EQ(boxes.size(), 3u);
+        press(dialog, "cmdClose");
+        EXPECT_FALSE(dialog.form().Visible());
+    });
+    EXPECT_TRUE(std::filesystem::exists(db.path() / "Dovrel.def"));
+}
+
+} // namespace
+} // namespace dovrel::test
