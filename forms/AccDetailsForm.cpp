@@ -8,14 +8,13 @@
 namespace dovrel {
 
 AccDetailsForm::AccDetailsForm(Card& card)
-    : Form("frmAccDetails"),
-      cmdCopyText{Button(ArrayElementName("cmdCopyText", 0)),
-                  Button(ArrayElementName("cmdCopyText", 1)),
-                  Button(ArrayElementName("cmdCopyText", 2))},
+    : Form("frmAccDetails"), cmdCopyText{Button(ArrayElementName("cmdCopyText", 0)),
+                                         Button(ArrayElementName("cmdCopyText", 1)),
+                                         Button(ArrayElementName("cmdCopyText", 2))},
       card_(&card) {
-    for (Control* control : std::initializer_list<Control*>{
-             &Label1, &txtPhone, &cmdCopyText[0], &Label2, &txtDetails, &cmdCopyText[1], &Label3,
-             &txtDistrict, &cmdCopyText[2]}) {
+    for (Control* control :
+         std::initializer_list<Control*>{&Label1, &txtPhone, &cmdCopyText[0], &Label2, &txtDetails,
+                                         &cmdCopyText[1], &Label3, &txtDistrict, &cmdCopyText[2]}) {
         addControl(*control);
         for (const ControlDesign& design : AccDetailsDesign())
             if (design.name == control->name())
@@ -44,8 +43,7 @@ void AccDetailsForm::Click(const std::string& name) {
     for (size_t i = 0; i < cmdCopyText.size(); ++i)
         if (name == cmdCopyText[i].name()) {
             if (!Visible())
-                throw Error("The account details window is not shown; " + name +
-                            " cannot be used");
+                throw Error("The account details window is not shown; " + name + " cannot be used");
             return cmdCopyText_Click(static_cast<int16_t>(i));
         }
 }

@@ -34,8 +34,7 @@ const std::array<char32_t, 256>& CodePoints() {
             else if (utf8.size() == 2)
                 cp = ((lead & 0x1Fu) << 6) | (static_cast<unsigned char>(utf8[1]) & 0x3Fu);
             else
-                cp = ((lead & 0x0Fu) << 12) |
-                     ((static_cast<unsigned char>(utf8[1]) & 0x3Fu) << 6) |
+                cp = ((lead & 0x0Fu) << 12) | ((static_cast<unsigned char>(utf8[1]) & 0x3Fu) << 6) |
                      (static_cast<unsigned char>(utf8[2]) & 0x3Fu);
             table[static_cast<size_t>(b)] = cp == 0xFFFD ? static_cast<char32_t>(b) : cp;
         }
@@ -184,7 +183,6 @@ void SortCompanies(std::vector<CompanyEntry>& table, int32_t lo, int32_t hi) {
 std::string ListedName(const CompanyEntry& entry) {
     return std::string(Trim(entry.name));
 }
-
 
 std::vector<CompanyEntry> FindCompanies(const std::string& root) {
     std::string main = WithSeparator(root);

@@ -44,8 +44,7 @@ std::vector<ControlDesign> MakeOpenDir() {
                        3000, inner, kButtonHeight));
     d.push_back(Design("cmbCompany", Kind::ListBox, "", kMargin, 3480, inner, 1980));
     d.push_back(Design("Msg1", Kind::Label, "", kMargin, 5520, inner, 255));
-    d.push_back(
-        Design("CancelButton", Kind::Button, "ביטול", kMargin, 5880, 1215, kButtonHeight));
+    d.push_back(Design("CancelButton", Kind::Button, "ביטול", kMargin, 5880, 1215, kButtonHeight));
     d.push_back(Design("OKButton", Kind::Button, "אישור", kOpenDirWidth - kMargin - 1215, 5880,
                        1215, kButtonHeight));
     return d;

@@ -19,9 +19,9 @@ OpenDirForm::OpenDirForm(Card& card) : OpenDirForm(card, SystemMountPoints()) {}
 
 OpenDirForm::OpenDirForm(Card& card, std::vector<std::string> drives)
     : Form("frmOpenDir"), PathDrive("PathDrive", std::move(drives)), card_(&card) {
-    for (Control* control : std::initializer_list<Control*>{
-             &Label1, &PathDrive, &MainDir, &cmdFindWizComp, &cmbCompany, &Msg1, &CancelButton,
-             &OKButton}) {
+    for (Control* control :
+         std::initializer_list<Control*>{&Label1, &PathDrive, &MainDir, &cmdFindWizComp,
+                                         &cmbCompany, &Msg1, &CancelButton, &OKButton}) {
         addControl(*control);
         for (const ControlDesign& design : OpenDirDesign())
             if (design.name == control->name())

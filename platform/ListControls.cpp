@@ -17,10 +17,9 @@ namespace {
 
 // File systems that hold no user files.
 const std::set<std::string, std::less<>> kInternalTypes = {
-    "autofs",  "binfmt_misc", "bpf",    "cgroup",    "cgroup2",   "configfs",
-    "debugfs", "devpts",      "fusectl", "hugetlbfs", "mqueue",    "nsfs",
-    "proc",    "pstore",      "rpc_pipefs", "securityfs", "selinuxfs", "sysfs",
-    "tracefs", "efivarfs"};
+    "autofs",     "binfmt_misc", "bpf",       "cgroup", "cgroup2", "configfs", "debugfs",
+    "devpts",     "fusectl",     "hugetlbfs", "mqueue", "nsfs",    "proc",     "pstore",
+    "rpc_pipefs", "securityfs",  "selinuxfs", "sysfs",  "tracefs", "efivarfs"};
 
 // The mounts table writes space, tab, newline and backslash as \ooo.
 std::string Unescape(const std::string& field) {

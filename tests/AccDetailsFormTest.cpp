@@ -47,8 +47,8 @@ protected:
     // Shows the window for the account key and runs what the user does there.
     void show(const std::string& key, const std::function<void(AccDetailsForm&)>& user,
               Clipboard* board = nullptr) {
-        CardServices services{messages, settings, forms, board ? *board : clipboard, browser,
-                              clock};
+        CardServices services{messages, settings, forms, board ? *board : clipboard,
+                              browser,  clock};
         Card card(services, state);
         card.SetCompDir(Variant(company.compPath()));
         card.txtAccountKey.setText(key);
@@ -121,10 +121,13 @@ TEST_F(AccDetailsFormTest, AnAccountNotFoundShowsEmptyWordsThatCanBeCopied) {
 
 TEST_F(AccDetailsFormTest, ABusyClipboardStillClosesTheWindow) {
     BusyClipboard busy;
-    show("1001", [](AccDetailsForm& form) {
-        form.Click("cmdCopyText(1)");
-        EXPECT_FALSE(form.Visible());
-    }, &busy);
+    show(
+        "1001",
+        [](AccDetailsForm& form) {
+            form.Click("cmdCopyText(1)");
+            EXPECT_FALSE(form.Visible());
+        },
+        &busy);
     EXPECT_TRUE(messages.shown().empty());
 }
 

@@ -1,7 +1,7 @@
 // `dovrel companies` and `dovrel account`: the chooser's list and the account
 // window's texts on the command line.
-#include "app/cli/AccountCommand.h"
 #include "app/cli/CompaniesCommand.h"
+#include "app/cli/AccountCommand.h"
 
 #include "RunCli.h"
 #include "TestCompany.h"
@@ -38,8 +38,8 @@ TEST(CompaniesCommandTest, ListsNamedCompaniesInTheChoosersOrder) {
     sample::WriteCompany(R"({"company": {"name": "   "}})", main.path() / "blank");
     std::string dir = main.str();
     EXPECT_EQ(Companies(dir, false), "אלף\t" + dir + "/a with space\nבית\t" + dir + "/b\n");
-    EXPECT_EQ(json::parse(Companies(dir + "/", true)),
-              json::parse(R"([{"name": "אלף", "path": ")" + dir + R"(/a with space"},
+    EXPECT_EQ(json::parse(Companies(dir + "/", true)), json::parse(R"([{"name": "אלף", "path": ")" +
+                                                                   dir + R"(/a with space"},
                               {"name": "בית", "path": ")" + dir + R"(/b"}])"));
 
     std::string err;
@@ -66,13 +66,14 @@ TEST(CompaniesCommandTest, ShowsAnAccountOrEmptyWords) {
 
 TEST(CompaniesCommandTest, TheCommandRunsBoth) {
     TempDir main;
-    sample::WriteCompany(R"({"company": {"name": "דמו"}, "accounts": [{"key": "1", "phone": "050"}]})",
-                         main.path() / "demo");
+    sample::WriteCompany(
+        R"({"company": {"name": "דמו"}, "accounts": [{"key": "1", "phone": "050"}]})",
+        main.path() / "demo");
     std::string dir = main.str();
     test::CliResult listed = test::RunCli({"companies", dir, "--json"});
     EXPECT_EQ(listed.code, 0) << listed.err;
-    EXPECT_EQ(json::parse(listed.out), json::parse(R"([{"name": "דמו", "path": ")" + dir +
-                                                   R"(/demo"}])"));
+    EXPECT_EQ(json::parse(listed.out),
+              json::parse(R"([{"name": "דמו", "path": ")" + dir + R"(/demo"}])"));
     test::CliResult shown = test::RunCli({"account", dir + "/demo", "1", "--json"});
     EXPECT_EQ(shown.code, 0) << shown.err;
     EXPECT_EQ(json::parse(shown.out)["phone"], "050");

@@ -257,7 +257,8 @@ TEST_F(HostSessionTest, TheChooserAndTheAccountWindowAreScripted) {
     sample::WriteCompany(named, main.path() / "comp01");
     sample::WriteCompany(R"({"company": {"name": "אחרת"}})", main.path() / "comp02");
     std::string dir = main.str();
-    ask({"modal", "frmOpenDir",
+    ask({"modal",
+         "frmOpenDir",
          {{"set", "frmOpenDir.MainDir", dir},
           {"click", "frmOpenDir.cmdFindWizComp"},
           {"select", "frmOpenDir.cmbCompany", 1},
@@ -271,8 +272,10 @@ TEST_F(HostSessionTest, TheChooserAndTheAccountWindowAreScripted) {
     EXPECT_EQ(ask({"get", "frmOpenDir.MainDir"})["value"], dir);
 
     ask({"set", "txtAccountKey", "1001"});
-    ask({"modal", "frmAccDetails",
-         {{"select", "frmAccDetails.txtPhone", 3, 100}, {"click", "frmAccDetails.cmdCopyText", 0}}});
+    ask({"modal",
+         "frmAccDetails",
+         {{"select", "frmAccDetails.txtPhone", 3, 100},
+          {"click", "frmAccDetails.cmdCopyText", 0}}});
     json copied = ask({"click", "cmdAccount"});
     ASSERT_EQ(copied["ok"], true) << copied;
     EXPECT_EQ(copied["state"]["forms"]["frmAccDetails"]["controls"]["txtDistrict"], "מרכז");
@@ -280,7 +283,8 @@ TEST_F(HostSessionTest, TheChooserAndTheAccountWindowAreScripted) {
               json::parse(R"({"start": 3, "length": 7})"));
     EXPECT_EQ(ask({"clipboard"})["result"], "1234567");
     // Copying an emptied box shows the message; the window stays until closed.
-    ask({"modal", "frmAccDetails",
+    ask({"modal",
+         "frmAccDetails",
          {{"set", "frmAccDetails.txtDetails", ""}, {"click", "frmAccDetails.cmdCopyText", 1}}});
     json empty = ask({"click", "cmdAccount"});
     ASSERT_EQ(empty["messages"].size(), 1u);
@@ -291,7 +295,8 @@ TEST_F(HostSessionTest, TheChooserAndTheAccountWindowAreScripted) {
         {{"select", "frmAccDetails.txtPhone", 1}, "takes 3 arguments"},
         {{"select", "frmAccDetails.txtPhone", -1, 2}, "selection start"},
         {{"click", "CmdDir", 1}, "not a control array"},
-        {{"click", "frmAccDetails.cmdCopyText", 5}, "Unknown control: frmAccDetails.cmdCopyText(5)"},
+        {{"click", "frmAccDetails.cmdCopyText", 5},
+         "Unknown control: frmAccDetails.cmdCopyText(5)"},
         {{"click", "frmAccDetails.cmdCopyText", 0}, "not shown"}};
     for (const auto& [request, words] : bad) {
         json reply = ask(request);

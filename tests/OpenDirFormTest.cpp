@@ -35,9 +35,10 @@ public:
 
 json Company(const std::string& name, const std::string& reference) {
     json line = {{"key", "A1"}, {"price", 1}, {"quantity", 1}};
-    return {{"company", {{"name", name}}},
-            {"documents",
-             {{{"type", 20}, {"reference", reference}, {"date", "2024-01-10"}, {"lines", {line}}}}}};
+    return {
+        {"company", {{"name", name}}},
+        {"documents",
+         {{{"type", 20}, {"reference", reference}, {"date", "2024-01-10"}, {"lines", {line}}}}}};
 }
 
 class OpenDirFormTest : public ::testing::Test {

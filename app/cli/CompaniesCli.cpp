@@ -25,9 +25,8 @@ void AddAccount(CLI::App& app, Runner& run) {
     account->add_option("COMPDIR", options->compDir, "Company directory")->required();
     account->add_option("KEY", options->key, "Account key")->required();
     account->add_flag("--json", options->json, "Print a JSON object");
-    account->callback([options, &run] {
-        run = [options] { return AccountCommand(*options).run(std::cout); };
-    });
+    account->callback(
+        [options, &run] { run = [options] { return AccountCommand(*options).run(std::cout); }; });
 }
 
 } // namespace dovrel

@@ -3,10 +3,10 @@
 #include "app/cli/CardMembers.h"
 #include "app/cli/StateJson.h"
 #include "control/CardInterface.h"
-#include "forms/FormDesigns.h"
 #include "fixfiles/AccountsFile.h"
 #include "fixfiles/CompanyFile.h"
 #include "fixfiles/TextDecoding.h"
+#include "forms/FormDesigns.h"
 #include "platform/Error.h"
 
 #include <istream>
@@ -190,8 +190,8 @@ void HostSession::addEventCommands() {
             if (args.size() == 2) {
                 if (dot == std::string::npos)
                     throw Error(target + " is not a control array of a form");
-                target = ArrayElementName(target, static_cast<int32_t>(args.integer(
-                                                      1, "index", 0, kInt16Max)));
+                target = ArrayElementName(
+                    target, static_cast<int32_t>(args.integer(1, "index", 0, kInt16Max)));
             }
             if (dot == std::string::npos) {
                 (session.card().*onCard)(target);
