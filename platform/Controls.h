@@ -35,9 +35,17 @@ public:
 
     const std::string& name() const { return name_; }
     ControlKind kind() const { return kind_; }
-    // The text a label, button or check box shows (code page 1255).
+    // The text a label, button or check box shows (code page 1255). Setting a
+    // different caption announces it, so a view can show it at once.
     const std::string& Caption() const { return caption_; }
-    void setCaption(std::string caption) { caption_ = std::move(caption); }
+    void setCaption(std::string caption) {
+        if (caption == caption_)
+            return;
+        caption_ = std::move(caption);
+        captionChanged();
+    }
+
+    Signal<> captionChanged;
 
 private:
     std::string name_;
