@@ -88,10 +88,16 @@ void OpenDirForm::QueryClose() {
     unloaded_ = true;
 }
 
+// A drive that cannot be opened is reported; the tree stays where it was.
 void OpenDirForm::PathDrive_Change() {
     std::string drive = PathDrive.Drive();
-    if (!drive.empty())
-        MainDir.setPath(drive);
+    if (!drive.empty()) {
+        try {
+            MainDir.setPath(drive);
+        } catch (const std::exception& e) {
+            showError("תקלה", FromUtf8(e.what()));
+        }
+    }
     cmbCompany.Clear();
     listed_.clear();
 }

@@ -186,7 +186,7 @@ TEST(OpenDirFormLoadTest, ADriveThatIsNotThereLeavesTheFirstAndADriveChangeMoves
     ModuleState state;
     Card card(messages, state);
     TempDir other;
-    OpenDirForm form(card, {"/", FromUtf8(other.str())});
+    OpenDirForm form(card, {"/", FromUtf8(other.str()), "/no-such-mount"});
     form.Load(); // the remembered drive is empty: "c:", which is not there
     EXPECT_EQ(form.PathDrive.Drive(), "/");
     EXPECT_EQ(form.MainDir.Path(), "/");
@@ -199,6 +199,11 @@ TEST(OpenDirFormLoadTest, ADriveThatIsNotThereLeavesTheFirstAndADriveChangeMoves
     ASSERT_NE(form.findControl("cmdFindWizComp"), nullptr);
     EXPECT_EQ(U(form.findControl("cmdFindWizComp")->Caption()), "לחץ כאן לחיפוש חברות חשבשבת...");
     EXPECT_EQ(form.controls().size(), 8u);
+    // A drive that cannot be opened is reported and the tree stays.
+    form.PathDrive.setListIndex(2);
+    EXPECT_EQ(form.MainDir.Path(), FromUtf8(other.str()));
+    ASSERT_EQ(messages.shown().size(), 1u);
+    EXPECT_EQ(U(messages.shown()[0].title), "תקלה");
 }
 
 } // namespace
