@@ -29,8 +29,9 @@ std::vector<PictureRange> Ranges() {
     std::vector<PictureRange> ranges;
     ranges.push_back({0, std::nullopt, "ZZZZZZZZZZZZ", std::nullopt, "999", "default.jpg"});
     for (int i = 1; i < kRanges; ++i) {
-        PictureRange range{0, "K" + Padded(i * 10, 6), "K" + Padded(i * 10 + 9, 6),
-                           std::nullopt, "500", "pic" + Padded(i, 4) + ".jpg"};
+        PictureRange range{
+            0,     "K" + Padded(i * 10, 6),      "K" + Padded(i * 10 + 9, 6), std::nullopt,
+            "500", "pic" + Padded(i, 4) + ".jpg"};
         if (i % 3 == 0)
             range.FromCatCode = "001";
         ranges.push_back(range);

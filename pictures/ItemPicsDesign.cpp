@@ -51,8 +51,8 @@ void AddHeader(std::vector<ControlDesign>& s) {
     s.push_back(CaptionLabel("Label1", "קובץ לוגו:", s.back()));
     s.push_back(Field("txtCompTitle", 240, 600, 6000));
     s.push_back(CaptionLabel("Label2", "פרטי כותרת:", s.back()));
-    s.push_back(Plain("Label3", Kind::Label, "שיוך תמונות לפריטים:", 5880, 1080, 2400,
-                      kLabelHeight));
+    s.push_back(
+        Plain("Label3", Kind::Label, "שיוך תמונות לפריטים:", 5880, 1080, 2400, kLabelHeight));
 }
 
 void AddPaths(std::vector<ControlDesign>& s) {
@@ -69,8 +69,8 @@ void AddPaths(std::vector<ControlDesign>& s) {
 }
 
 void AddRanges(std::vector<ControlDesign>& s) {
-    s.push_back(Plain("Label8", Kind::Label, ":תמונות לקבוצות פריטים ", 5280, 2760, 3000,
-                      kLabelHeight));
+    s.push_back(
+        Plain("Label8", Kind::Label, ":תמונות לקבוצות פריטים ", 5280, 2760, 3000, kLabelHeight));
     s.push_back(Plain("ItemPicLines", Kind::Grid, "", 120, 3060, 8160, 2640));
     const char* buttons[][2] = {{"CmdDelete", "מחק מהרשימה"},
                                 {"CmdNew", "שורה חדשה"},

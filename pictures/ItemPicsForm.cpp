@@ -137,8 +137,8 @@ int16_t ItemPicsForm::FillGridLines(const std::string& pDbName) {
         ++count;
         ItemPicLines.AddItem("", count);
         const std::optional<std::string>* cells[] = {&range.FromItemKey, &range.ToItemKey,
-                                                      &range.FromCatCode, &range.ToCatCode,
-                                                      &range.PicFile};
+                                                     &range.FromCatCode, &range.ToCatCode,
+                                                     &range.PicFile};
         for (int32_t col = 0; col < 5; ++col)
             ItemPicLines.setTextMatrix(count, col, cells[col]->value_or(""));
         rangeIds_.insert(rangeIds_.begin() + count, range.RangeID);
@@ -168,9 +168,12 @@ bool ItemPicsForm::CheckDBFile() {
 
 void ItemPicsForm::Click(const std::string& name) {
     static const std::map<std::string, void (ItemPicsForm::*)()> handlers = {
-        {"CmdDelete", &ItemPicsForm::CmdDelete_Click},   {"CmdNew", &ItemPicsForm::CmdNew_Click},
-        {"CmdUpdate", &ItemPicsForm::CmdUpdate_Click},   {"cmdSaveDef", &ItemPicsForm::cmdSaveDef_Click},
-        {"CmdInitDB", &ItemPicsForm::CmdInitDB_Click},   {"cmdClose", &ItemPicsForm::cmdClose_Click}};
+        {"CmdDelete", &ItemPicsForm::CmdDelete_Click},
+        {"CmdNew", &ItemPicsForm::CmdNew_Click},
+        {"CmdUpdate", &ItemPicsForm::CmdUpdate_Click},
+        {"cmdSaveDef", &ItemPicsForm::cmdSaveDef_Click},
+        {"CmdInitDB", &ItemPicsForm::CmdInitDB_Click},
+        {"cmdClose", &ItemPicsForm::cmdClose_Click}};
     if (auto it = handlers.find(name); it != handlers.end())
         (this->*it->second)();
     else if (findControl(name) == nullptr)
@@ -257,9 +260,9 @@ void ItemPicsForm::CmdInitDB_Click() {
     try {
         PictureDb::Inspection old = PictureDb(dbName).inspect();
         if (old.kind == PictureDb::FileKind::Foreign) {
-            std::string question = FromUtf8("הקובץ ") + dbName +
-                                   FromUtf8(" אינו בסיס נתונים של תמונות (") +
-                                   FromUtf8(old.reason) + FromUtf8("). להחליף אותו בבסיס נתונים ריק?");
+            std::string question =
+                FromUtf8("הקובץ ") + dbName + FromUtf8(" אינו בסיס נתונים של תמונות (") +
+                FromUtf8(old.reason) + FromUtf8("). להחליף אותו בבסיס נתונים ריק?");
             if (messages().show(MsgIcon::Question, MsgButtons::YesNo, FromUtf8("שימו לב"),
                                 question) != MsgAnswer::Yes)
                 return;

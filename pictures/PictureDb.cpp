@@ -10,13 +10,13 @@
 
 #include <algorithm>
 #include <array>
-#include <climits>
-#include <memory>
-#include <random>
 #include <cerrno>
+#include <climits>
 #include <cstring>
 #include <filesystem>
 #include <fstream>
+#include <memory>
+#include <random>
 
 #include <fcntl.h>
 #include <sys/stat.h>
@@ -229,8 +229,8 @@ std::string Head(const std::string& fsPath, size_t size) {
 std::string ForeignReason(const std::string& head) {
     if (head.empty())
         return "the file is empty";
-    if (head.size() >= 19 &&
-        (head.compare(4, 15, "Standard Jet DB") == 0 || head.compare(4, 15, "Standard ACE DB") == 0))
+    if (head.size() >= 19 && (head.compare(4, 15, "Standard Jet DB") == 0 ||
+                              head.compare(4, 15, "Standard ACE DB") == 0))
         return "it is an Access (Jet) database, not an SQLite picture database";
     if (head.compare(0, 16, std::string("SQLite format 3\0", 16)) != 0)
         return "it is not an SQLite database";

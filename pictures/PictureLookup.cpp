@@ -33,8 +33,8 @@ bool Within(const std::string& value, const std::string& from, const std::string
 PictureLookup::PictureLookup(std::vector<PictureRange> ranges) : ranges_(std::move(ranges)) {
     keys_.reserve(ranges_.size());
     for (const PictureRange& range : ranges_)
-        keys_.push_back({KeyOf(range.FromItemKey), KeyOf(range.ToItemKey),
-                         KeyOf(range.FromCatCode), KeyOf(range.ToCatCode)});
+        keys_.push_back({KeyOf(range.FromItemKey), KeyOf(range.ToItemKey), KeyOf(range.FromCatCode),
+                         KeyOf(range.ToCatCode)});
 }
 
 bool PictureLookup::contains(size_t range, const std::string& key, const std::string& code) const {

@@ -19,9 +19,9 @@
 namespace dovrel {
 namespace {
 
-using ::testing::HasSubstr;
 using test::U;
 using test::W;
+using ::testing::HasSubstr;
 using Text = std::optional<std::string>;
 
 // Shows the form and runs what the user does in it; then the window closes.
@@ -98,7 +98,8 @@ TEST_F(ItemPicsFormTest, AFirstStartShowsTheDefaultsAndEveryControlOfTheDesign) 
     EXPECT_EQ(form.ItemPicLines.Rows(), 1);
     EXPECT_EQ(U(form.ItemPicLines.FormatString()),
               "<ממפתח פריט          |<עד מפתח פריט          |<מקוד מיון |<עד קוד מיון |"
-              "<קובץ תמונה" + std::string(40, ' '));
+              "<קובץ תמונה" +
+                  std::string(40, ' '));
     EXPECT_TRUE(messages.shown().empty());
 
     std::set<std::string> names;
@@ -148,7 +149,8 @@ TEST_F(ItemPicsFormTest, SavingWritesTheRowsAsRanges1ToNInOneTransaction) {
 
     // A refused row: the message names it and nothing is stored.
     form.Click("CmdNew");
-    EXPECT_EQ(rows(form)[3], (std::vector<std::string>{"", "תתתתתתתתתתתת", "", "999", "pic001.jpg"}));
+    EXPECT_EQ(rows(form)[3],
+              (std::vector<std::string>{"", "תתתתתתתתתתתת", "", "999", "pic001.jpg"}));
     form.ItemPicLines.setTextMatrix(1, 4, "changed.jpg");
     form.ItemPicLines.setTextMatrix(2, 1, "");
     form.Click("CmdUpdate");
@@ -171,7 +173,8 @@ TEST_F(ItemPicsFormTest, SavingWritesTheRowsAsRanges1ToNInOneTransaction) {
 
 TEST_F(ItemPicsFormTest, DeleteTakesTheRangeTheSelectedRowShowsEvenWithGaps) {
     db.create(false);
-    db.replaceAll({R("1", "1", {}, "9", "a"), R("2", "2", {}, "9", "b"), R("3", "3", {}, "9", "c")});
+    db.replaceAll(
+        {R("1", "1", {}, "9", "a"), R("2", "2", {}, "9", "b"), R("3", "3", {}, "9", "c")});
     db.remove(2); // another program left a gap
     ItemPicsForm& form = start();
     ASSERT_EQ(rows(form).size(), 2u);
@@ -207,8 +210,8 @@ TEST_F(ItemPicsFormTest, ReCreatingAsksAndKeepsAForeignFileUnlessConfirmedTwice)
 
     messages.queueAnswer(MsgAnswer::Yes);
     form.Click("CmdInitDB");
-    EXPECT_EQ(shown(), (std::vector<std::string>{"שימו לב: האם אתה בטוח?",
-                                                 "הודעה: בסיס הנתונים אותחל"}));
+    EXPECT_EQ(shown(),
+              (std::vector<std::string>{"שימו לב: האם אתה בטוח?", "הודעה: בסיס הנתונים אותחל"}));
     EXPECT_TRUE(db.rangesById().empty());
     EXPECT_EQ(rows(form).size(), 1u); // the grid keeps its rows for a save
 

@@ -26,9 +26,9 @@
 namespace dovrel {
 namespace {
 
-using ::testing::HasSubstr;
 using test::U;
 using test::W;
+using ::testing::HasSubstr;
 using Range = PictureRange;
 using Text = std::optional<std::string>;
 
@@ -96,7 +96,8 @@ protected:
         }
         return shown;
     }
-    std::vector<std::string> pictures(const std::vector<std::pair<std::string, std::string>>& lines) {
+    std::vector<std::string>
+    pictures(const std::vector<std::pair<std::string, std::string>>& lines) {
         return pictures(lines, dbName());
     }
     std::string dbName() const { return FromUtf8(file.string()); }
@@ -115,8 +116,8 @@ protected:
 
 TEST(PictureCollationTest, OrdersSpaceDigitsLatinHebrewIgnoringCase) {
     const PictureCollation& order = PictureCollation::instance();
-    const std::vector<std::string> ascending = {" ", "0", "1", "10", "100", "1A", "2", "2A",
-                                                "5", "9", "a", "AB", "b", "z", "א", "אב", "ת"};
+    const std::vector<std::string> ascending = {" ", "0", "1",  "10", "100", "1A", "2",  "2A", "5",
+                                                "9", "a", "AB", "b",  "z",   "א",  "אב", "ת"};
     for (size_t i = 0; i + 1 < ascending.size(); ++i) {
         std::string a = W(ascending[i]), b = W(ascending[i + 1]);
         EXPECT_LT(order.compare(a, b), 0) << ascending[i] << " before " << ascending[i + 1];
@@ -143,13 +144,13 @@ TEST_F(PictureDbTest, TheSchemaHoldsEveryWriterToItsRules) {
     EXPECT_EQ(run(insert + std::string("(1, NULL, NULL, NULL, NULL, NULL)")), SQLITE_OK);
     EXPECT_EQ(run(insert + std::string("(2, 'אאאאאאאאאאאא', 'b', 'ג', 'ddd', 'x.jpg')")),
               SQLITE_OK); // twelve Hebrew letters are twelve characters
-    for (const char* refused : {"(3, '', 'b', NULL, NULL, 'p')", "(3, 'a', '', NULL, NULL, 'p')",
-                                "(3, NULL, NULL, '', NULL, 'p')", "(3, NULL, NULL, NULL, '', 'p')",
-                                "(3, NULL, NULL, NULL, NULL, '')",
-                                "(3, 'aaaaaaaaaaaaa', NULL, NULL, NULL, 'p')",
-                                "(3, NULL, NULL, 'aaaa', NULL, 'p')", "(3, NULL, NULL, NULL, NULL, x'00')",
-                                "(2147483648, NULL, NULL, NULL, NULL, 'p')", "(1, 'a', 'b', 'c', 'd', 'e')",
-                                "('x', NULL, NULL, NULL, NULL, 'p')"})
+    for (const char* refused :
+         {"(3, '', 'b', NULL, NULL, 'p')", "(3, 'a', '', NULL, NULL, 'p')",
+          "(3, NULL, NULL, '', NULL, 'p')", "(3, NULL, NULL, NULL, '', 'p')",
+          "(3, NULL, NULL, NULL, NULL, '')", "(3, 'aaaaaaaaaaaaa', NULL, NULL, NULL, 'p')",
+          "(3, NULL, NULL, 'aaaa', NULL, 'p')", "(3, NULL, NULL, NULL, NULL, x'00')",
+          "(2147483648, NULL, NULL, NULL, NULL, 'p')", "(1, 'a', 'b', 'c', 'd', 'e')",
+          "('x', NULL, NULL, NULL, NULL, 'p')"})
         EXPECT_NE(run(insert + std::string(refused)), SQLITE_OK) << refused;
     EXPECT_EQ(run(insert + std::string("(-2147483648, NULL, NULL, NULL, NULL, 'p')")), SQLITE_OK);
     sqlite3_close(raw);
@@ -163,9 +164,9 @@ TEST_F(PictureDbTest, TheSchemaHoldsEveryWriterToItsRules) {
 
 TEST_F(PictureDbTest, TheLookupOrderPutsNullFirstAndFollowsTheTextOrder) {
     db.create(false);
-    db.replaceAll({R("b", "z", {}, {}, "1"), R({}, "z", "5", {}, "2"), R(W("א"), W("ת"), {}, {}, "3"),
-                   R("10", "z", {}, {}, "4"), R("5", "z", {}, {}, "5"), R("B", "z", "1", {}, "6"),
-                   R({}, "z", {}, {}, "7")});
+    db.replaceAll({R("b", "z", {}, {}, "1"), R({}, "z", "5", {}, "2"),
+                   R(W("א"), W("ת"), {}, {}, "3"), R("10", "z", {}, {}, "4"),
+                   R("5", "z", {}, {}, "5"), R("B", "z", "1", {}, "6"), R({}, "z", {}, {}, "7")});
     std::vector<std::string> order;
     for (const Range& range : db.rangesInLookupOrder())
         order.push_back(*range.PicFile);
@@ -175,14 +176,15 @@ TEST_F(PictureDbTest, TheLookupOrderPutsNullFirstAndFollowsTheTextOrder) {
 TEST_F(PictureDbTest, TheLastRangeInLookupOrderGivesTheLinePicture) {
     db.create(false);
     // Range A is open below and range B sorts after it, so B wins where both hold.
-    db.replaceAll({R({}, W("תתתתתתתתתתתת"), {}, "999", "pic001.jpg"),
-                   R("100", "199", {}, {}, "b.jpg")});
+    db.replaceAll(
+        {R({}, W("תתתתתתתתתתתת"), {}, "999", "pic001.jpg"), R("100", "199", {}, {}, "b.jpg")});
     EXPECT_EQ(pictures({{"150", "010"}, {"250", "010"}, {"150", "   "}, {"  150       ", "010"}}),
               (std::vector<std::string>{"b.jpg", "pic001.jpg", "", "b.jpg"}));
 
     db.replaceAll({R("10", "20", {}, {}, "in.jpg")});
-    EXPECT_EQ(pictures({{"100", "1"}, {"1A", "1"}, {"1a", "1"}, {"3", "1"}, {"2A", "1"}, {"20", "1"}}),
-              (std::vector<std::string>{"in.jpg", "in.jpg", "in.jpg", "", "", "in.jpg"}));
+    EXPECT_EQ(
+        pictures({{"100", "1"}, {"1A", "1"}, {"1a", "1"}, {"3", "1"}, {"2A", "1"}, {"20", "1"}}),
+        (std::vector<std::string>{"in.jpg", "in.jpg", "in.jpg", "", "", "in.jpg"}));
 
     // Codes keep their spaces: " 5 " sorts before "5" and "05" after "0".
     db.replaceAll({R({}, {}, "5", "7", "code.jpg"), R({}, {}, {}, {}, "all.jpg"),
@@ -283,8 +285,8 @@ TEST_F(PictureDbTest, ChangesThatFailLeaveTheStoredRangesAsTheyWere) {
     db.create(false);
     db.replaceAll({R("a", "b", {}, {}, "p"), R("c", "d", {}, {}, "q")});
     const std::vector<Range> before = db.rangesById();
-    std::vector<Range> many(300, R("aaaaaaaaaaaa", "bbbbbbbbbbbb", "ccc", "ddd",
-                                   std::string(50, 'x')));
+    std::vector<Range> many(300,
+                            R("aaaaaaaaaaaa", "bbbbbbbbbbbb", "ccc", "ddd", std::string(50, 'x')));
 
     // A full disk: the file may not grow beyond its size.
     rlim_t size = static_cast<rlim_t>(std::filesystem::file_size(file));

@@ -23,8 +23,7 @@ struct Result {
 
 class PicturesCommandTest : public ::testing::Test {
 protected:
-    Result run(const std::string& action, std::vector<std::string> args = {},
-               bool useDb = true) {
+    Result run(const std::string& action, std::vector<std::string> args = {}, bool useDb = true) {
         PicturesOptions options;
         options.db = useDb ? dir.str() : "";
         options.action = action;
@@ -51,8 +50,8 @@ protected:
 };
 
 TEST_F(PicturesCommandTest, AddsListsFindsAndDeletesRanges) {
-    EXPECT_EQ(run("list").err, "There is no picture database at " + file +
-                                   " (dovrel pictures init makes one)\n");
+    EXPECT_EQ(run("list").err,
+              "There is no picture database at " + file + " (dovrel pictures init makes one)\n");
     EXPECT_EQ(run("init").out, "Created an empty picture database at " + file + "\n");
     EXPECT_EQ(run("add", {"", "תתתתתתתתתתתת", "", "999", "pic001.jpg"}).out, "Added range 1\n");
     EXPECT_EQ(run("add", {"100", "199", "b.jpg"}).out, "Added range 2\n");
@@ -89,7 +88,8 @@ TEST_F(PicturesCommandTest, ImportReplacesEveryRangeOrNothing) {
     EXPECT_THAT(failure("import", {csv}), HasSubstr("row 3: the highest item key"));
     EXPECT_THAT(run("list").out, HasSubstr("keep.jpg"));
 
-    std::ofstream(csv, std::ios::trunc) << ",z,,999,\"a,b.jpg\"\r\n10,20,1,2,\"say \"\"x\"\".jpg\"\r\n";
+    std::ofstream(csv, std::ios::trunc)
+        << ",z,,999,\"a,b.jpg\"\r\n10,20,1,2,\"say \"\"x\"\".jpg\"\r\n";
     EXPECT_EQ(run("import", {csv}).out, "Imported 2 picture ranges\n");
     const std::string imported = run("list").out;
     EXPECT_EQ(imported, "RangeID\tFromItemKey\tToItemKey\tFromCatCode\tToCatCode\tPicFile\n"
@@ -121,7 +121,8 @@ TEST_F(PicturesCommandTest, TheFolderComesFromTheSettingsAndAForeignFileIsKept) 
     EXPECT_EQ(test::ReadAll(file), "not a database at all, but someone's file");
     force = true;
     EXPECT_EQ(run("init").code, 0);
-    EXPECT_EQ(run("list").out, "RangeID\tFromItemKey\tToItemKey\tFromCatCode\tToCatCode\tPicFile\n");
+    EXPECT_EQ(run("list").out,
+              "RangeID\tFromItemKey\tToItemKey\tFromCatCode\tToCatCode\tPicFile\n");
 }
 
 TEST_F(PicturesCommandTest, TheCommandLineReachesTheCommand) {

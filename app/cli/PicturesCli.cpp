@@ -12,7 +12,8 @@ void AddPictures(CLI::App& app, Runner& run) {
         app.add_subcommand("pictures", "List and change the item picture ranges of Dovrel.def");
     pictures->add_option("--db", options->db,
                          "Directory of Dovrel.def (default: the DBPath setting)");
-    pictures->add_option("--app", options->app, "Application name of the settings (default Dovrel)");
+    pictures->add_option("--app", options->app,
+                         "Application name of the settings (default Dovrel)");
     pictures->require_subcommand(1);
     pictures->fallthrough();
     pictures->add_subcommand("init", "Make an empty picture database")

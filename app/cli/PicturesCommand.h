@@ -10,12 +10,12 @@
 namespace dovrel {
 
 struct PicturesOptions {
-    std::string db;             // --db DIR (UTF-8); empty: the DBPath setting
-    std::string app = "Dovrel"; // the settings' application name, for DBPath
-    std::string action;         // init, list, add, delete, which, export or import
+    std::string db;                // --db DIR (UTF-8); empty: the DBPath setting
+    std::string app = "Dovrel";    // the settings' application name, for DBPath
+    std::string action;            // init, list, add, delete, which, export or import
     std::vector<std::string> args; // the action's own arguments, UTF-8
-    bool json = false;          // list as JSON
-    bool force = false;         // init: replace a file that is not a picture database
+    bool json = false;             // list as JSON
+    bool force = false;            // init: replace a file that is not a picture database
 };
 
 // `dovrel pictures`: the picture ranges of "Dovrel.def" without the desktop.
