@@ -294,5 +294,25 @@ TEST_F(ItemPicsFormTest, TheControlGivesTheLinesOfADocumentTheirPictures) {
     EXPECT_EQ(doc.lines[3].picFile, std::string(50, ' ')); // not in the items file
 }
 
+TEST_F(ItemPicsFormTest, APrintedDemoDocumentWithDrawingsShowsTheLinePictures) {
+    db.create(false);
+    db.replaceAll({R({}, "ZZZ", {}, "999", "all.jpg"), R("BR", "BR-9999", {}, "999", "br.jpg")});
+    ItemPicsForm& form = start();
+    form.txtPicPath.setText("/pics/");
+    int16_t type = 20;
+    int32_t first = 2;
+    ASSERT_EQ(card->ShowDoc(FromUtf8(DOVREL_DEMO_DIR), type, first), 0);
+    card->ChkWithDrawing.setValue(1);
+    for (int32_t language : {0, 1}) {
+        card->CmbDocLang.setListIndex(language);
+        browser.opened.clear();
+        card->Click("PrintButt");
+        ASSERT_EQ(browser.opened.size(), 1u) << ::testing::PrintToString(shown());
+        std::string page = test::ReadAll(browser.opened[0]);
+        EXPECT_THAT(page, HasSubstr("<img src='/pics/br.jpg'")) << language;
+        EXPECT_THAT(page, HasSubstr("<img src='/pics/all.jpg'")) << language;
+    }
+}
+
 } // namespace
 } // namespace dovrel
