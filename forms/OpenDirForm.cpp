@@ -110,6 +110,7 @@ void OpenDirForm::MainDir_Change() {
 
 void OpenDirForm::cmdFindWizComp_Click() {
     Msg1.setCaption(FromUtf8(kScanning));
+    repaint();
     if (!MainDir.Path().empty()) {
         cmbCompany.setEnabled(false);
         FindWizPaths(MainDir.Path());

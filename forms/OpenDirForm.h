@@ -46,6 +46,10 @@ public:
     const std::string& LastDrive() const { return lastDrive_; }
     const std::string& LastMainDir() const { return lastMainDir_; }
 
+    // Raised when the status line must be shown at once: the scan that
+    // follows keeps the user-interface thread until it ends.
+    Signal<> repaint;
+
     Label Label1{"Label1"};
     DriveListBox PathDrive;
     DirListBox MainDir{"MainDir"};

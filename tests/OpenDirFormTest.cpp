@@ -57,6 +57,9 @@ protected:
     // Opens the chooser, goes to the main directory and scans it.
     void scanThen(const std::function<void(OpenDirForm&)>& then) {
         forms.user = [&](OpenDirForm& form) {
+            if (form.repaint.empty())
+                form.repaint.connect(
+                    [&form, this] { statusWhileScanning = U(form.Msg1.Caption()); });
             form.MainDir.setPath(FromUtf8(main.str()));
             form.Click("cmdFindWizComp");
             then(form);
@@ -72,6 +75,7 @@ protected:
     }
 
     TempDir main;
+    std::string statusWhileScanning;
     RecordedMessages messages;
     MemorySettingsStore settings;
     ScriptedForms forms;
@@ -93,6 +97,7 @@ TEST_F(OpenDirFormTest, ChoosingACompanySetsThePathAndFirstReadsFromIt) {
     });
     // Blank names are left out; the entry after one still gives its own directory.
     EXPECT_EQ(listed(), (std::vector<std::string>{"אלף", "בית", "גמל"}));
+    EXPECT_EQ(statusWhileScanning, "סורק ומאתר חברות. נא להמתין..");
     EXPECT_EQ(state.CompDir, dir("comp03"));
     EXPECT_EQ(card->txtCompPath.Text(), dir("comp03"));
     EXPECT_EQ(chooser().companies().size(), 4u);
