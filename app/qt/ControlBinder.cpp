@@ -136,10 +136,9 @@ void ControlBinder::user(const std::function<void()>& step) {
 
 // Runs the refresher now, again on every change the model announces, and on
 // every refresh; it stops once the binder is gone.
-template <typename Model>
-void ControlBinder::follow(Model& model, std::function<void()> refresher) {
+void ControlBinder::follow(Signal<>& changed, std::function<void()> refresher) {
     refresher();
-    model.changed.connect([alive = alive_, refresher] {
+    changed.connect([alive = alive_, refresher] {
         if (*alive)
             refresher();
     });
@@ -153,7 +152,7 @@ QWidget* ControlBinder::makeTextBox(TextBox& box, const ControlDesign& design) {
         palette.setColor(QPalette::Base, palette.color(QPalette::Button));
         edit->setPalette(palette);
     }
-    follow(box, [edit, &box, this] {
+    follow(box.changed, [edit, &box, this] {
         QString text = ToQString(box.Text());
         ++syncing_;
         if (edit->text() != text)
@@ -191,7 +190,7 @@ void ControlBinder::selectionToModel(QLineEdit* edit, TextBox& box) {
 QWidget* ControlBinder::makeComboBox(ComboBox& list, const ControlDesign& design) {
     auto* combo = new QComboBox(surface_);
     combo->setEditable(false);
-    follow(list, [combo, &list, this] {
+    follow(list.changed, [combo, &list, this] {
         ++syncing_;
         QStringList entries;
         for (int32_t i = 0; i < list.ListCount(); ++i)
@@ -223,7 +222,7 @@ QWidget* ControlBinder::makeComboBox(ComboBox& list, const ControlDesign& design
 QWidget* ControlBinder::makeListBox(ComboBox& list, const ControlDesign& design) {
     auto* view = new QListWidget(surface_);
     auto* box = dynamic_cast<ListBox*>(&list);
-    follow(list, [view, &list, box, this] {
+    follow(list.changed, [view, &list, box, this] {
         ++syncing_;
         QStringList entries;
         for (int32_t i = 0; i < list.ListCount(); ++i)
@@ -264,7 +263,7 @@ QWidget* ControlBinder::makeDirList(Control& control) {
     for (int column = 1; column < files->columnCount(); ++column)
         view->hideColumn(column);
     view->setHeaderHidden(true);
-    follow(tree, [view, files, &tree, this] {
+    follow(tree.changed, [view, files, &tree, this] {
         QModelIndex index = files->index(QString::fromStdString(ResolvePath(tree.Path())));
         if (!index.isValid() || index == view->currentIndex())
             return;
@@ -283,7 +282,7 @@ QWidget* ControlBinder::makeDirList(Control& control) {
 
 QWidget* ControlBinder::makeCheckBox(CheckBox& check, const ControlDesign& design) {
     auto* box = new QCheckBox(ToQString(design.caption), surface_);
-    follow(check, [box, &check] {
+    follow(check.changed, [box, &check] {
         box->setTristate(check.Value() == 2);
         box->setCheckState(check.Value() == 1   ? Qt::Checked
                            : check.Value() == 2 ? Qt::PartiallyChecked
@@ -295,7 +294,7 @@ QWidget* ControlBinder::makeCheckBox(CheckBox& check, const ControlDesign& desig
                                                                     : 0;
         user([&] { check.setValue(value); });
     });
-    refreshers_.push_back([box, &check] { box->setText(ToQString(check.Caption())); });
+    follow(check.captionChanged, [box, &check] { box->setText(ToQString(check.Caption())); });
     watch(box, design.name);
     return box;
 }
@@ -312,7 +311,7 @@ QWidget* ControlBinder::draw(const ControlDesign& design) {
 
 // A label with a model shows its caption and passes on its clicks; one
 // without shows the designed caption only.
-QWidget* ControlBinder::makeLabel(const Control* label, const ControlDesign& design) {
+QWidget* ControlBinder::makeLabel(Control* label, const ControlDesign& design) {
     auto* text =
         new QLabel(ToQString(label != nullptr ? label->Caption() : design.caption), surface_);
     // A caption keeps close to the field it names, which stands to its left.
@@ -329,7 +328,14 @@ QWidget* ControlBinder::makeLabel(const Control* label, const ControlDesign& des
         text->setPalette(palette);
     }
     if (label != nullptr) {
-        refreshers_.push_back([text, label] { text->setText(ToQString(label->Caption())); });
+        // A caption set while a handler runs (a "please wait" line) is shown
+        // at once, before the handler's long work.
+        auto show = [text, label] { text->setText(ToQString(label->Caption())); };
+        follow(label->captionChanged, show);
+        label->captionChanged.connect([alive = alive_, text] {
+            if (*alive && text->isVisible())
+                text->repaint();
+        });
         text->installEventFilter(this);
     }
     return text;
@@ -350,7 +356,7 @@ QWidget* ControlBinder::makeButton(Control& button, const ControlDesign& design)
     std::string name = design.name;
     connect(tool, &QToolButton::clicked, this,
             [this, name] { user([&] { events_.click(name); }); });
-    refreshers_.push_back([tool, &button] { tool->setText(ToQString(button.Caption())); });
+    follow(button.captionChanged, [tool, &button] { tool->setText(ToQString(button.Caption())); });
     return tool;
 }
 

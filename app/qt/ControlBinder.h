@@ -62,14 +62,14 @@ private:
     void selectionToModel(QLineEdit* edit, TextBox& box);
     QWidget* makeComboBox(ComboBox& list, const ControlDesign& design);
     QWidget* makeCheckBox(CheckBox& check, const ControlDesign& design);
-    QWidget* makeLabel(const Control* label, const ControlDesign& design);
+    QWidget* makeLabel(Control* label, const ControlDesign& design);
     QWidget* makeButton(Control& button, const ControlDesign& design);
     QWidget* makeListBox(ComboBox& list, const ControlDesign& design);
     QWidget* makeDirList(Control& tree);
     QWidget* makeShape(const ControlDesign& design);
     QWidget* makeGrid(Control& grid, bool editable);
     void watch(QWidget* widget, const std::string& name);
-    template <typename Model> void follow(Model& model, std::function<void()> refresher);
+    void follow(Signal<>& changed, std::function<void()> refresher);
     void user(const std::function<void()>& step);
 
     QWidget* surface_;

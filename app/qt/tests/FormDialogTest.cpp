@@ -109,6 +109,32 @@ TEST_F(FormDialogTest, TheCompanyChooserScansTheChosenDirectoryAndReturnsTheComp
     EXPECT_EQ(card().PubACTLocation, 2);
 }
 
+TEST_F(FormDialogTest, TheChooserShowsThatItScansBeforeTheScanEnds) {
+    TempDir main;
+    std::filesystem::create_directories(main.path() / "gone");
+    QString shownDuringScan;
+    open("CmdDir", [&](FormDialog& dialog) {
+        auto* tree = in<QTreeView>(dialog, "MainDir");
+        auto* files = qobject_cast<QFileSystemModel*>(tree->model());
+        tree->setCurrentIndex(
+            files->index(QString::fromStdString((main.path() / "gone").string())));
+        std::filesystem::remove(main.path() / "gone");
+        // The failed scan's message box opens while the handler still runs.
+        messages.setRunner([&](QMessageBox& box) {
+            shownDuringScan = in<QLabel>(dialog, "Msg1")->text();
+            boxes.push_back({box.windowTitle(), box.text(), box.icon(), box.standardButtons(),
+                             box.layoutDirection()});
+            return QMessageBox::Ok;
+        });
+        press(dialog, "cmdFindWizComp");
+        EXPECT_EQ(in<QLabel>(dialog, "Msg1")->text(), Q("הסריקה הסתיימה. תקתוק כפול לבחירה..."));
+        press(dialog, "CancelButton");
+    });
+    EXPECT_EQ(shownDuringScan, Q("סורק ומאתר חברות. נא להמתין.."));
+    ASSERT_EQ(boxes.size(), 1u);
+    EXPECT_EQ(boxes[0].title, Q("תקלה"));
+}
+
 TEST_F(FormDialogTest, ThePictureSettingsFormEditsItsRangesInTheGrid) {
     TempDir db;
     open("CmdParams", [&](FormDialog& dialog) {
