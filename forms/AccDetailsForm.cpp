@@ -11,7 +11,7 @@ AccDetailsForm::AccDetailsForm(Card& card)
     : Form("frmAccDetails"), cmdCopyText{Button(ArrayElementName("cmdCopyText", 0)),
                                          Button(ArrayElementName("cmdCopyText", 1)),
                                          Button(ArrayElementName("cmdCopyText", 2))},
-      card_(&card) {
+      shared_(card.shared()), card_(&card) {
     for (Control* control :
          std::initializer_list<Control*>{&Label1, &txtPhone, &cmdCopyText[0], &Label2, &txtDetails,
                                          &cmdCopyText[1], &Label3, &txtDistrict, &cmdCopyText[2]}) {
@@ -29,7 +29,7 @@ void AccDetailsForm::prepare(Card& card) {
 
 // A window loaded afresh: the account's texts, nothing selected.
 void AccDetailsForm::Load() {
-    const AccountEntry& account = card_->shared().Accounts.CurrentAccount;
+    const AccountEntry& account = shared_.Accounts.CurrentAccount;
     txtPhone.setText(account.Phone);
     txtDetails.setText(account.Details);
     txtDistrict.setText(account.District);
@@ -49,6 +49,8 @@ void AccDetailsForm::Click(const std::string& name) {
 }
 
 void AccDetailsForm::cmdCopyText_Click(int16_t Index) {
+    if (!Visible())
+        throw Error("The account details window is not shown; cmdCopyText cannot be used");
     TextBox* boxes[] = {&txtPhone, &txtDetails, &txtDistrict};
     if (Index < 0 || Index > 2)
         throw Error("cmdCopyText has no element " + std::to_string(Index));

@@ -10,6 +10,7 @@
 namespace dovrel {
 
 class Card;
+struct ModuleState;
 
 // The account details window: the phones, details and district of the
 // account on screen, each with a button that copies it and closes the
@@ -28,7 +29,8 @@ public:
     void Click(const std::string& name) override;
 
     // Copies the selected text of box Index (0 phones, 1 details, 2 district),
-    // or its whole text when nothing is selected, and closes the window.
+    // or its whole text when nothing is selected, and closes the window. Only
+    // while the window is shown.
     void cmdCopyText_Click(int16_t Index);
 
     Label Label1{"Label1"};
@@ -40,6 +42,7 @@ public:
     std::array<Button, 3> cmdCopyText;
 
 private:
+    ModuleState& shared_;
     Card* card_;
 };
 

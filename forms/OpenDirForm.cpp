@@ -18,7 +18,8 @@ constexpr const char* kScanDone = "הסריקה הסתיימה. תקתוק כפ�
 OpenDirForm::OpenDirForm(Card& card) : OpenDirForm(card, SystemMountPoints()) {}
 
 OpenDirForm::OpenDirForm(Card& card, std::vector<std::string> drives)
-    : Form("frmOpenDir"), PathDrive("PathDrive", std::move(drives)), card_(&card) {
+    : Form("frmOpenDir"), PathDrive("PathDrive", std::move(drives)), shared_(card.shared()),
+      card_(&card) {
     for (Control* control :
          std::initializer_list<Control*>{&Label1, &PathDrive, &MainDir, &cmdFindWizComp,
                                          &cmbCompany, &Msg1, &CancelButton, &OKButton}) {
@@ -68,7 +69,6 @@ void OpenDirForm::requireShown(const std::string& control) const {
 }
 
 void OpenDirForm::Click(const std::string& name) {
-    requireShown(name);
     if (name == "cmdFindWizComp")
         cmdFindWizComp_Click();
     else if (name == "OKButton")
@@ -78,7 +78,6 @@ void OpenDirForm::Click(const std::string& name) {
 }
 
 void OpenDirForm::DblClick(const std::string& name) {
-    requireShown(name);
     if (name == "cmbCompany")
         OKButton_Click();
 }
@@ -109,6 +108,7 @@ void OpenDirForm::MainDir_Change() {
 }
 
 void OpenDirForm::cmdFindWizComp_Click() {
+    requireShown("cmdFindWizComp");
     Msg1.setCaption(FromUtf8(kScanning));
     repaint();
     if (!MainDir.Path().empty()) {
@@ -139,22 +139,26 @@ void OpenDirForm::FindWizPaths(const std::string& root) {
 }
 
 void OpenDirForm::OKButton_Click() {
+    requireShown("OKButton");
     int32_t index = cmbCompany.ListIndex();
     if (index < 0 || static_cast<size_t>(index) >= listed_.size()) {
         showError("שגיאה", FromUtf8("לא בחרת חברה"));
         return;
     }
-    card_->shared().CompDir = companies_[listed_[static_cast<size_t>(index)]].path;
+    shared_.CompDir = companies_[listed_[static_cast<size_t>(index)]].path;
     lastDrive_ = PathDrive.Drive();
     lastMainDir_ = MainDir.Path();
     Hide();
 }
 
 void OpenDirForm::CancelButton_Click() {
+    requireShown("CancelButton");
     Hide();
 }
 
 void OpenDirForm::showError(const char* titleUtf8, const std::string& text) {
+    if (!Visible())
+        throw Error(ToUtf8(text));
     card_->services().messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8(titleUtf8), text);
 }
 

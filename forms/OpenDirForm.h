@@ -11,6 +11,7 @@
 namespace dovrel {
 
 class Card;
+struct ModuleState;
 
 // The company chooser: finds the companies under a main directory and sets
 // the control's company path to the one the user picks. The form is kept
@@ -22,8 +23,10 @@ public:
     explicit OpenDirForm(Card& card);
     OpenDirForm(Card& card, std::vector<std::string> drives);
 
-    // The control that shows the form now; its messages and company path are
-    // the ones used. Reloads the form when its window was closed.
+    // The control that shows the form now; its message box is the one used.
+    // Reloads the form when its window was closed. The buttons work only
+    // while the form is shown, and a hidden form shows no message: what it
+    // would say is thrown to the caller instead.
     void prepare(Card& card);
 
     void Load() override;
@@ -64,6 +67,7 @@ private:
     void requireShown(const std::string& control) const;
     void reset();
 
+    ModuleState& shared_;
     Card* card_;
     std::vector<CompanyEntry> companies_;
     std::vector<size_t> listed_; // the company of each list entry

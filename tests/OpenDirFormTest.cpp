@@ -204,7 +204,11 @@ TEST(OpenDirFormLoadTest, ADriveThatIsNotThereLeavesTheFirstAndADriveChangeMoves
     ASSERT_NE(form.findControl("cmdFindWizComp"), nullptr);
     EXPECT_EQ(U(form.findControl("cmdFindWizComp")->Caption()), "לחץ כאן לחיפוש חברות חשבשבת...");
     EXPECT_EQ(form.controls().size(), 8u);
-    // A drive that cannot be opened is reported and the tree stays.
+    // A drive that cannot be opened: an error while the form is hidden, a
+    // message while it is shown; the tree stays.
+    EXPECT_THROW(form.PathDrive.setListIndex(2), Error);
+    form.PathDrive.setListIndex(1);
+    form.Show();
     form.PathDrive.setListIndex(2);
     EXPECT_EQ(form.MainDir.Path(), FromUtf8(other.str()));
     ASSERT_EQ(messages.shown().size(), 1u);
