@@ -100,6 +100,14 @@ void StockSeeds(const fs::path& out, const std::string& ishp, int company) {
               prefix + ishp);
 }
 
+// The options byte of the page target, then the document file.
+void PageSeeds(const fs::path& out, const std::string& ishp, int company) {
+    int n = 0;
+    for (char options : {char(0x00), char(0x0F), char(0x7F), char(0xFF)})
+        Write(out / "pages", "company" + std::to_string(company) + "-" + std::to_string(n++),
+              options + ishp);
+}
+
 void ItemSeeds(const fs::path& out, const fs::path& company, int index) {
     std::string keys = "A100        B200        b200        1001        ";
     int n = 0;
@@ -160,6 +168,7 @@ int main(int argc, char** argv) {
             WriteCompany(description, company);
             if (fs::exists(company / "ISHP.FIX"))
                 StockSeeds(out, ReadAll(company / "ISHP.FIX"), index);
+                PageSeeds(out, ReadAll(company / "ISHP.FIX"), index);
             ItemSeeds(out, company, index);
             RecordSeeds(out, company, index);
             ++index;
