@@ -2,6 +2,7 @@
 // document its picture, and the picture settings form.
 #include "control/Card.h"
 
+#include "pictures/ItemPicsForm.h"
 #include "pictures/PictureLookup.h"
 
 namespace dovrel {
@@ -13,7 +14,8 @@ void Card::FillPicPath(std::string& pDbName) {
 // Closing the form drops what was typed but not saved: it is loaded again
 // from the settings store and the picture database, as on its next use.
 void Card::CmdParams_Click() {
-    Form& settings = form("frmItemPics");
+    auto& settings = dynamic_cast<ItemPicsForm&>(form("frmItemPics"));
+    settings.attach(*this);
     services_.forms.ShowModal(settings);
     if (!settings.Visible())
         settings.Load();

@@ -51,7 +51,7 @@ std::optional<std::string> NullWhenEmpty(const std::string& text) {
 
 } // namespace
 
-ItemPicsForm::ItemPicsForm(Card& card) : Form("frmItemPics"), card_(card) {
+ItemPicsForm::ItemPicsForm(Card& card) : Form("frmItemPics"), shared_(card.shared()), card_(&card) {
     buildControls();
 }
 
@@ -81,7 +81,7 @@ void ItemPicsForm::buildControls() {
 }
 
 Messages& ItemPicsForm::messages() const {
-    return card_.services().messages;
+    return card_->services().messages;
 }
 
 void ItemPicsForm::showFailure(const std::exception& failure) const {
@@ -94,7 +94,7 @@ bool ItemPicsForm::confirm(const char* questionUtf8) const {
 }
 
 std::string ItemPicsForm::settingDbName() const {
-    return card_.shared().DBPath + PictureDb::kFileName;
+    return shared_.DBPath + PictureDb::kFileName;
 }
 
 void ItemPicsForm::Load() {
@@ -109,13 +109,12 @@ void ItemPicsForm::Load() {
 }
 
 void ItemPicsForm::mirrorSettings() {
-    ModuleState& shared = card_.shared();
-    shared.LogoFile = txtLogoFile.Text();
-    shared.CompTitle = txtCompTitle.Text();
-    shared.DBPath = txtDBPath.Text();
-    shared.PicPath = txtPicPath.Text();
-    shared.PicX = txtPicX.Text();
-    shared.PicY = txtPicY.Text();
+    shared_.LogoFile = txtLogoFile.Text();
+    shared_.CompTitle = txtCompTitle.Text();
+    shared_.DBPath = txtDBPath.Text();
+    shared_.PicPath = txtPicPath.Text();
+    shared_.PicX = txtPicX.Text();
+    shared_.PicY = txtPicY.Text();
 }
 
 void ItemPicsForm::InitItemPicLines() {
@@ -154,8 +153,8 @@ int32_t ItemPicsForm::RowRangeID(int32_t row) const {
 
 void ItemPicsForm::SetGetMoreParams(uint8_t Action) {
     for (const Setting& setting : kSettings)
-        card_.SetGetRegParam(Action, card_.shared().AppName, "Params", setting.key,
-                             this->*setting.box, 1, Variant(FromUtf8(setting.defaultUtf8)));
+        card_->SetGetRegParam(Action, shared_.AppName, "Params", setting.key, this->*setting.box, 1,
+                              Variant(FromUtf8(setting.defaultUtf8)));
 }
 
 bool ItemPicsForm::CheckDBFile() {
@@ -254,7 +253,7 @@ void ItemPicsForm::CmdUpdate_Click() {
 void ItemPicsForm::CmdInitDB_Click() {
     if (!confirm("האם אתה בטוח?"))
         return;
-    card_.shared().DBPath = txtDBPath.Text();
+    shared_.DBPath = txtDBPath.Text();
     std::string dbName = settingDbName();
     bool replaceForeign = false;
     try {

@@ -13,12 +13,18 @@ namespace dovrel {
 
 class Card;
 class Messages;
+struct ModuleState;
 
 // The picture settings form: the printed page's settings and the ranges of
-// item keys and category codes with their pictures.
+// item keys and category codes with their pictures. The form lives in the
+// module state and may outlive the control that made it: it keeps the state,
+// and works through the services of the control that last attached it.
 class ItemPicsForm : public Form {
 public:
     explicit ItemPicsForm(Card& card);
+
+    // The control whose settings store and message boxes the form uses from now on.
+    void attach(Card& card) { card_ = &card; }
 
     // Resets the grid, loads the six settings, mirrors them into the module
     // state and fills the grid from the picture database.
@@ -70,7 +76,8 @@ private:
     bool confirm(const char* questionUtf8) const;
     void reloadGrid();
 
-    Card& card_;
+    ModuleState& shared_;
+    Card* card_;
     std::vector<std::unique_ptr<Control>> plain_; // labels and frames
     std::vector<int32_t> rangeIds_;               // by grid row, heading included
 };

@@ -314,5 +314,15 @@ TEST_F(ItemPicsFormTest, APrintedDemoDocumentWithDrawingsShowsTheLinePictures) {
     }
 }
 
+TEST_F(ItemPicsFormTest, TheFormOutlivesTheControlThatMadeIt) {
+    start();
+    card.reset(); // the form stays in the module state
+    Card second(services, state);
+    second.UserControl_InitProperties(nullptr);
+    forms.script = [](Form& shown) { shown.Click("CmdNew"); };
+    second.Click("CmdParams");
+    EXPECT_EQ(shown(), std::vector<std::string>{"שגיאה: קובץ ההגדרות אינו נמצא"});
+}
+
 } // namespace
 } // namespace dovrel
