@@ -6,6 +6,8 @@
 
 #include <QFontDatabase>
 
+#include <exception>
+
 namespace dovrel {
 
 CardWidget::CardWidget(const CardServices& services, ModuleState& shared, QWidget* parent)
@@ -71,6 +73,18 @@ void CardWidget::call(const std::function<void()>& step) {
     if (depth_ > 0)
         throw Error("The control is busy: a call cannot start while another one runs");
     InputHoldScope hold(hold_);
+    std::exception_ptr failure;
+    try {
+        runStep(step);
+    } catch (...) {
+        failure = std::current_exception();
+    }
+    runWaitingSteps();
+    if (failure)
+        std::rethrow_exception(failure);
+}
+
+void CardWidget::runStep(const std::function<void()>& step) {
     ++depth_;
     progress_->setScanning(true);
     struct Done {
@@ -84,13 +98,36 @@ void CardWidget::call(const std::function<void()>& step) {
     step();
 }
 
+// Steps for the user that came up while a call ran (a list that lost the
+// focus to a button pressed during a scan) run after it, in their order, and
+// before the held input is delivered.
+void CardWidget::runWaitingSteps() {
+    while (!waiting_.empty()) {
+        std::function<void()> next = std::move(waiting_.front());
+        waiting_.erase(waiting_.begin());
+        try {
+            runStep(next);
+        } catch (const std::exception& failure) {
+            reportFailure(failure);
+        }
+    }
+}
+
 void CardWidget::runForUser(const std::function<void()>& step) {
+    if (depth_ > 0) {
+        waiting_.push_back(step);
+        return;
+    }
     try {
         call(step);
     } catch (const std::exception& failure) {
-        card_->services().messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("תקלה"),
-                                        failure.what());
+        reportFailure(failure);
     }
+}
+
+void CardWidget::reportFailure(const std::exception& failure) {
+    card_->services().messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("תקלה"),
+                                    failure.what());
 }
 
 } // namespace dovrel

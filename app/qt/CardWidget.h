@@ -7,8 +7,10 @@
 
 #include <QWidget>
 
+#include <exception>
 #include <functional>
 #include <memory>
+#include <vector>
 
 namespace dovrel {
 
@@ -39,6 +41,7 @@ public:
     void call(const std::function<void()>& step);
     // Runs one step for the user (a click, a typed text): as call, but a
     // failure is shown in a message box titled "תקלה" with its description.
+    // A step that comes while a call runs waits for its end.
     void runForUser(const std::function<void()>& step);
 
     // The font of the surface: Arial where the system has it, otherwise a
@@ -49,12 +52,16 @@ public:
 
 private:
     void bindSurface();
+    void runStep(const std::function<void()>& step);
+    void runWaitingSteps();
+    void reportFailure(const std::exception& failure);
 
     std::unique_ptr<Card> card_;
     InputHold hold_;
     ControlBinder* binder_ = nullptr;
     ProgressWidget* progress_ = nullptr;
     int depth_ = 0;
+    std::vector<std::function<void()>> waiting_;
 };
 
 } // namespace dovrel

@@ -127,6 +127,8 @@ void ControlBinder::refresh() {
         refresher();
 }
 
+// The step may run later (when it comes while the owner is busy), so it holds
+// copies of what it needs.
 void ControlBinder::user(const std::function<void()>& step) {
     if (events_.run)
         events_.run(step);
@@ -163,7 +165,7 @@ QWidget* ControlBinder::makeTextBox(TextBox& box, const ControlDesign& design) {
         --syncing_;
     });
     connect(edit, &QLineEdit::textEdited, this, [this, edit, &box](const QString& text) {
-        user([&] { box.setText(FromQString(text)); });
+        user([&box, text] { box.setText(FromQString(text)); });
         QString stored = ToQString(box.Text());
         if (edit->text() != stored)
             edit->setText(stored);
@@ -178,9 +180,11 @@ QWidget* ControlBinder::makeTextBox(TextBox& box, const ControlDesign& design) {
 }
 
 // Each character of the core's code page is one byte there and one unit of
-// Qt's strings, so the positions carry over as they are.
+// Qt's strings, so the positions carry over as they are. Only the user's
+// selection counts: the box keeps it when the focus leaves, as a button that
+// copies the selection needs, while Qt's line edit drops it.
 void ControlBinder::selectionToModel(QLineEdit* edit, TextBox& box) {
-    if (syncing_ > 0 || edit->text() != ToQString(box.Text()))
+    if (syncing_ > 0 || !edit->hasFocus() || edit->text() != ToQString(box.Text()))
         return;
     bool selected = edit->hasSelectedText();
     box.setSelStart(selected ? edit->selectionStart() : edit->cursorPosition());
@@ -208,7 +212,7 @@ QWidget* ControlBinder::makeComboBox(ComboBox& list, const ControlDesign& design
     connect(combo, &QComboBox::currentIndexChanged, this, [this, combo, &list](int index) {
         if (syncing_ > 0)
             return;
-        user([&] { list.setListIndex(index); });
+        user([&list, index] { list.setListIndex(index); });
         if (combo->currentIndex() != list.ListIndex()) {
             ++syncing_;
             combo->setCurrentIndex(list.ListIndex());
@@ -241,12 +245,12 @@ QWidget* ControlBinder::makeListBox(ComboBox& list, const ControlDesign& design)
     });
     connect(view, &QListWidget::currentRowChanged, this, [this, &list](int row) {
         if (syncing_ == 0)
-            user([&] { list.setListIndex(row); });
+            user([&list, row] { list.setListIndex(row); });
     });
     std::string name = design.name;
     connect(view, &QListWidget::itemDoubleClicked, this, [this, name] {
         if (events_.dblClick)
-            user([&] { events_.dblClick(name); });
+            user([this, name] { events_.dblClick(name); });
     });
     return view;
 }
@@ -272,11 +276,12 @@ QWidget* ControlBinder::makeDirList(Control& control) {
         view->scrollTo(index);
         --syncing_;
     });
-    connect(view->selectionModel(), &QItemSelectionModel::currentChanged, this,
-            [this, files, &tree](const QModelIndex& current) {
-                if (syncing_ == 0 && current.isValid())
-                    user([&] { tree.setPath(FromQString(files->filePath(current))); });
-            });
+    connect(
+        view->selectionModel(), &QItemSelectionModel::currentChanged, this,
+        [this, files, &tree](const QModelIndex& current) {
+            if (syncing_ == 0 && current.isValid())
+                user([&tree, path = files->filePath(current)] { tree.setPath(FromQString(path)); });
+        });
     return view;
 }
 
@@ -292,7 +297,7 @@ QWidget* ControlBinder::makeCheckBox(CheckBox& check, const ControlDesign& desig
         int32_t value = box->checkState() == Qt::Checked            ? 1
                         : box->checkState() == Qt::PartiallyChecked ? 2
                                                                     : 0;
-        user([&] { check.setValue(value); });
+        user([&check, value] { check.setValue(value); });
     });
     follow(check.captionChanged, [box, &check] { box->setText(ToQString(check.Caption())); });
     watch(box, design.name);
@@ -344,6 +349,10 @@ QWidget* ControlBinder::makeLabel(Control* label, const ControlDesign& design) {
 QWidget* ControlBinder::makeButton(Control& button, const ControlDesign& design) {
     auto* tool = new QToolButton(surface_);
     tool->setText(ToQString(button.Caption()));
+    // A button takes the focus when pressed, so the field the user leaves
+    // hears of it before the click; a bare picture does not.
+    bool image = button.Caption().empty() && !design.picture.empty();
+    tool->setFocusPolicy(image ? Qt::NoFocus : Qt::StrongFocus);
     QStyle::StandardPixmap picture = PictureOf(design.picture);
     if (picture != QStyle::SP_CustomBase) {
         tool->setIcon(surface_->style()->standardIcon(picture));
@@ -355,7 +364,7 @@ QWidget* ControlBinder::makeButton(Control& button, const ControlDesign& design)
     }
     std::string name = design.name;
     connect(tool, &QToolButton::clicked, this,
-            [this, name] { user([&] { events_.click(name); }); });
+            [this, name] { user([this, name] { events_.click(name); }); });
     follow(button.captionChanged, [tool, &button] { tool->setText(ToQString(button.Caption())); });
     return tool;
 }
@@ -418,19 +427,19 @@ bool ControlBinder::eventFilter(QObject* watched, QEvent* event) {
         if (doubleClicked_ == watched)
             doubleClicked_ = nullptr;
         else if (events_.click)
-            user([&] { events_.click(name); });
+            user([this, name] { events_.click(name); });
         break;
     case QEvent::MouseButtonDblClick:
         if (qobject_cast<QLabel*>(watched) == nullptr || !events_.dblClick)
             break;
         doubleClicked_ = watched;
-        user([&] { events_.dblClick(name); });
+        user([this, name] { events_.dblClick(name); });
         break;
     case QEvent::FocusOut: {
         auto reason = static_cast<QFocusEvent*>(event)->reason();
         if (reason != Qt::PopupFocusReason && reason != Qt::ActiveWindowFocusReason &&
             events_.lostFocus)
-            user([&] { events_.lostFocus(name); });
+            user([this, name] { events_.lostFocus(name); });
         break;
     }
     default:

@@ -135,6 +135,13 @@ TEST_F(CardWidgetTest, ClicksRunTheControlsHandlersAndTheBoxesShowTheDocument) {
     click("NextButt");
     EXPECT_EQ(text("txtReference1").trimmed(), "103");
 
+    // Leaving the document-type list for a button resets the position and
+    // the search before the button's click: "Next" starts afresh.
+    find("cmbDocType")->setFocus();
+    click("NextButt");
+    EXPECT_EQ(card().PubSearchBy, "");
+    EXPECT_EQ(text("txtReference1").trimmed(), "102");
+
     // A single click on the details label searches.
     retype(find<QLineEdit>("txtDetails"), "zzz");
     click("lblDetails");

@@ -32,6 +32,8 @@ protected:
         workForm = [&](FormDialog& dialog) {
             shown = true;
             dialog.show();
+            dialog.activateWindow();
+            EXPECT_TRUE(QTest::qWaitForWindowActive(&dialog));
             EXPECT_EQ(dialog.layoutDirection(), Qt::RightToLeft);
             work(dialog);
         };
@@ -57,6 +59,7 @@ TEST_F(FormDialogTest, AccountDetailsCopyTheSelectionOrTheWholeBox) {
         EXPECT_EQ(in<QLineEdit>(dialog, "txtDistrict")->text().trimmed(), Q("מרכז"));
         auto* phone = in<QLineEdit>(dialog, "txtPhone");
         ASSERT_TRUE(phone->text().startsWith("03-1234567"));
+        phone->setFocus();
         phone->setSelection(0, 10);
         press(dialog, "cmdCopyText(0)");
         EXPECT_FALSE(dialog.form().Visible());

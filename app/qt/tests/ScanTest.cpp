@@ -82,5 +82,34 @@ TEST_F(ScanTest, InputDuringAScanWaitsUntilItEnds) {
     EXPECT_TRUE(boxes.empty());
 }
 
+TEST_F(ScanTest, AListLeftDuringAScanHearsOfItAfterTheScan) {
+    click("FirstButt");
+    find("cmbDocType")->setFocus();
+    ASSERT_TRUE(find("cmbDocType")->hasFocus());
+    card().PubSearchBy = "CustomerName";
+    card().PubSearchValue = Variant(W("אחרון"));
+    bool clicked = false;
+    std::string searchAfterClick;
+    card().ProgressFill.changed.connect([&] {
+        if (clicked || card().ProgressFill.Width() == 0)
+            return;
+        clicked = true;
+        // Pressing a button takes the focus from the list at once; the
+        // list's handler must not run inside the scan.
+        QTest::mouseClick(widget->widgetFor("PrevButt"), Qt::LeftButton);
+        searchAfterClick = card().PubSearchBy;
+    });
+    // A scan the host starts: the focus stays in the list.
+    widget->runForUser([&] { card().Click("NextButt"); });
+    ASSERT_TRUE(clicked);
+    EXPECT_EQ(searchAfterClick, "CustomerName");
+    EXPECT_EQ(reference(), "2");       // found under the search
+    EXPECT_EQ(card().PubSearchBy, ""); // then the list's handler cleared it
+    EXPECT_EQ(card().PubACTLocation, 2);
+    QCoreApplication::processEvents(); // "Previous" from record 2 finds nothing before it
+    EXPECT_EQ(reference(), "");
+    EXPECT_TRUE(boxes.empty()) << (boxes.empty() ? "" : boxes[0].text.toStdString());
+}
+
 } // namespace
 } // namespace dovrel::test
