@@ -36,6 +36,9 @@ protected:
             EXPECT_TRUE(QTest::qWaitForWindowActive(&dialog));
             EXPECT_EQ(dialog.layoutDirection(), Qt::RightToLeft);
             work(dialog);
+            // A picture of the dialog as the test left it, for a look at its layout.
+            dialog.grab().save(QString::fromUtf8(DOVREL_QT_OUTPUT_DIR) + "/" +
+                               QString::fromStdString(dialog.form().name()) + ".png");
         };
         click(button);
         EXPECT_TRUE(shown) << button;
