@@ -9,70 +9,31 @@
 #include "app/qt/QtFormPresenter.h"
 #include "app/qt/QtMessages.h"
 #include "app/qt/QtText.h"
+#include "app/qt/ViewerOptions.h"
 #include "platform/Clock.h"
 #include "platform/Encoding.h"
 #include "platform/SettingsStore.h"
 
 #include <QApplication>
-#include <QCommandLineParser>
 #include <QMainWindow>
 
 #include <iostream>
-
-namespace {
-
-struct Options {
-    QString compDir;
-    int type = 20;
-    int start = 2;
-};
-
-bool ParseNumber(const QString& text, int low, int high, int& value) {
-    bool ok = false;
-    int number = text.toInt(&ok);
-    if (!ok || number < low || number > high)
-        return false;
-    value = number;
-    return true;
-}
-
-// Reads the command line; false after printing what is wrong with it.
-bool ParseOptions(const QApplication& app, Options& options) {
-    QCommandLineParser parser;
-    parser.setApplicationDescription("Shows the stock documents of a company.");
-    parser.addHelpOption();
-    parser.addPositionalArgument("COMPDIR", "The company directory to open.", "[COMPDIR]");
-    QCommandLineOption type("type", "The document type code (default 20).", "CODE", "20");
-    QCommandLineOption start("start", "The record to start from, 1 or more (default 2).", "N", "2");
-    parser.addOption(type);
-    parser.addOption(start);
-    parser.process(app);
-    if (parser.positionalArguments().size() > 1) {
-        std::cerr << "dovrel-viewer: give at most one company directory\n";
-        return false;
-    }
-    if (!ParseNumber(parser.value(type), -32768, 32767, options.type)) {
-        std::cerr << "dovrel-viewer: --type takes a document type code\n";
-        return false;
-    }
-    if (!ParseNumber(parser.value(start), 1, 2147483647, options.start)) {
-        std::cerr << "dovrel-viewer: --start takes a record number of 1 or more\n";
-        return false;
-    }
-    if (!parser.positionalArguments().isEmpty())
-        options.compDir = parser.positionalArguments().front();
-    return true;
-}
-
-} // namespace
 
 int main(int argc, char* argv[]) {
     QApplication app(argc, argv);
     QApplication::setApplicationName("dovrel-viewer");
     QApplication::setLayoutDirection(Qt::RightToLeft);
-    Options options;
-    if (!ParseOptions(app, options))
+    dovrel::ViewerOptions options;
+    try {
+        options = dovrel::ViewerOptions::Parse(QApplication::arguments());
+    } catch (const std::exception& e) {
+        std::cerr << "dovrel-viewer: " << dovrel::ToUtf8(e.what()) << '\n';
         return 2;
+    }
+    if (options.help) {
+        std::cout << dovrel::ViewerOptions::HelpText().toStdString();
+        return 0;
+    }
 
     using namespace dovrel;
     QtMessages messages;
