@@ -2,6 +2,8 @@
 
 #include "pictures/PictureDb.h"
 
+#include <cstdint>
+#include <optional>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -17,6 +19,15 @@ struct CurrentDocument;
 // order (FromItemKey, then FromCatCode, Null first) decides.
 class PictureLookup {
 public:
+    // A text's sort key, its first eight bytes also as one number, so that
+    // most comparisons are decided without comparing the bytes; a Null bound
+    // has no key.
+    struct SortKey {
+        uint64_t head = 0;
+        std::string bytes;
+        bool null = true;
+    };
+
     // The ranges in the lookup order (PictureDb::rangesInLookupOrder).
     explicit PictureLookup(std::vector<PictureRange> ranges);
 
@@ -28,10 +39,11 @@ public:
 
 private:
     struct Keys {
-        std::string fromKey, toKey, fromCode, toCode;
+        SortKey fromKey, toKey, fromCode, toCode;
     };
 
-    bool contains(size_t range, const std::string& key, const std::string& code) const;
+    static SortKey sortKeyOf(const std::optional<std::string>& text);
+    bool contains(size_t range, const SortKey& key, const SortKey& code) const;
 
     std::vector<PictureRange> ranges_;
     std::vector<Keys> keys_; // sort keys of the bounds, beside each range

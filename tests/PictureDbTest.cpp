@@ -141,6 +141,10 @@ TEST_F(PictureDbTest, TheSchemaHoldsEveryWriterToItsRules) {
         return sqlite3_exec(raw, sql.c_str(), nullptr, nullptr, nullptr);
     };
     const char* insert = "INSERT INTO tItemPicture VALUES ";
+    // Without the text order a program cannot write the table at all.
+    EXPECT_NE(run(insert + std::string("(1, NULL, NULL, NULL, NULL, NULL)")), SQLITE_OK);
+    EXPECT_THAT(sqlite3_errmsg(raw), HasSubstr("no such collation sequence: HEBREW_NOCASE"));
+    PictureCollation::instance().registerWith(raw);
     EXPECT_EQ(run(insert + std::string("(1, NULL, NULL, NULL, NULL, NULL)")), SQLITE_OK);
     EXPECT_EQ(run(insert + std::string("(2, 'אאאאאאאאאאאא', 'b', 'ג', 'ddd', 'x.jpg')")),
               SQLITE_OK); // twelve Hebrew letters are twelve characters
@@ -213,6 +217,7 @@ TEST_F(PictureDbTest, TheLookupLeavesLinesAloneWithoutDatabaseOrRangeAndFailsOnA
     db.replaceAll({R({}, {}, {}, {}, "p")});
     sqlite3* raw = nullptr;
     ASSERT_EQ(sqlite3_open(file.c_str(), &raw), SQLITE_OK);
+    PictureCollation::instance().registerWith(raw);
     sqlite3_exec(raw, "UPDATE tItemPicture SET PicFile = NULL", nullptr, nullptr, nullptr);
     sqlite3_close(raw);
     EXPECT_THAT(FailureOf([&] { FillPictures(dbName(), doc); }),
