@@ -91,7 +91,11 @@ TEST_F(CardWidgetTest, EveryControlOfTheSurfaceHasAWidgetWhereItIsDesigned) {
     // The grey boxes have the button face behind their text.
     QLineEdit* date = find<QLineEdit>("txtDate");
     EXPECT_EQ(date->palette().color(QPalette::Base), date->palette().color(QPalette::Button));
-    EXPECT_NE(text("txtCompPath"), QString());
+    // A first start: the settings' defaults and no document.
+    EXPECT_EQ(text("txtCompPath"), "c:\\comp02");
+    EXPECT_EQ(find<QComboBox>("cmbDocType")->currentIndex(), card().cmbDocType.ListIndex());
+    EXPECT_EQ(text("txtFromDate"), "01/01/1980");
+    EXPECT_EQ(text("txtReference1"), "");
 
     // A fresh grid: the heading of eight columns and one empty row.
     auto* lines = find<QTableView>("DocLines");

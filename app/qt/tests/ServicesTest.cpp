@@ -1,0 +1,64 @@
+#include "app/qt/QtBrowser.h"
+#include "app/qt/QtClipboard.h"
+#include "app/qt/QtText.h"
+#include "platform/Encoding.h"
+#include "platform/Error.h"
+
+#include "TestCompany.h"
+
+#include <QDate>
+#include <QUrl>
+
+#include <fstream>
+
+namespace dovrel {
+namespace {
+
+using test::TempDir;
+using test::W;
+
+TEST(ServicesTest, TheClipboardKeepsHebrewText) {
+    QtClipboard clipboard;
+    clipboard.SetText(W("טלפון 03-1234567"));
+    EXPECT_EQ(clipboard.GetText(), W("טלפון 03-1234567"));
+}
+
+TEST(ServicesTest, TheBrowserGetsTheLocalFileAddressOfThePage) {
+    TempDir dir;
+    std::filesystem::path page = dir.path() / "דף הדפסה.htm";
+    std::ofstream(page) << "<html></html>";
+    QtBrowser browser;
+    std::vector<QUrl> opened;
+    browser.setOpener([&](const QUrl& url) {
+        opened.push_back(url);
+        return true;
+    });
+    browser.Open(FromUtf8(page.string()));
+    ASSERT_EQ(opened.size(), 1u);
+    EXPECT_TRUE(opened[0].isLocalFile());
+    EXPECT_EQ(opened[0].toLocalFile(), QString::fromStdString(page.string()));
+
+    browser.setOpener([](const QUrl&) { return false; });
+    EXPECT_THROW(browser.Open(FromUtf8(page.string())), Error);
+}
+
+TEST(ServicesTest, HostValuesBecomeTheControlsVariantsAndBack) {
+    EXPECT_TRUE(FromQVariant(QVariant()).isEmpty());
+    EXPECT_TRUE(FromQVariant(QVariant::fromValue(nullptr)).isNull());
+    EXPECT_EQ(FromQVariant(QString::fromUtf8("אבג")), Variant(W("אבג")));
+    EXPECT_EQ(FromQVariant(10.5), Variant(10.5));
+    EXPECT_EQ(FromQVariant(QVariant::fromValue<short>(-3)), Variant(-3));
+    EXPECT_EQ(FromQVariant(true), Variant(true));
+    EXPECT_THROW(FromQVariant(QDate(2024, 1, 1)), Error);
+
+    EXPECT_FALSE(ToQVariant(Variant()).isValid());
+    EXPECT_EQ(ToQVariant(Variant::Null()).typeId(), QMetaType::Nullptr);
+    EXPECT_EQ(ToQVariant(Variant(W("שלום"))), QVariant(QString::fromUtf8("שלום")));
+    EXPECT_EQ(ToQVariant(Variant(12)), QVariant(12.0));
+    EXPECT_EQ(ToQVariant(Variant(false)), QVariant(false));
+    // A byte the code page leaves undefined shows as the replacement mark.
+    EXPECT_EQ(ToQString(std::string("\xFF", 1)), QString(QChar(0xFFFD)));
+}
+
+} // namespace
+} // namespace dovrel
