@@ -217,10 +217,32 @@ TEST_F(CardWidgetTest, PrintAsksTheBrowserToOpenThePage) {
 
 TEST_F(CardWidgetTest, MembersCanBeCalledByName) {
     writeCompany();
+    // Every member by its name, with the Qt kind of each argument and result.
+    auto kind = [](CardInterface::Type type) {
+        switch (type) {
+        case CardInterface::Type::Int16:
+            return QMetaType::Short;
+        case CardInterface::Type::Int32:
+            return QMetaType::Int;
+        case CardInterface::Type::Byte:
+            return QMetaType::UChar;
+        case CardInterface::Type::Boolean:
+            return QMetaType::Bool;
+        case CardInterface::Type::Text:
+            return QMetaType::QString;
+        case CardInterface::Type::Variant:
+            return QMetaType::QVariant;
+        case CardInterface::Type::None:
+            return QMetaType::Void;
+        }
+        return QMetaType::UnknownType;
+    };
     const QMetaObject* meta = object->metaObject();
     for (const CardInterface::Member& member : CardInterface::Members()) {
         if (member.isProperty) {
-            EXPECT_GE(meta->indexOfProperty(member.name), 0) << member.name;
+            int index = meta->indexOfProperty(member.name);
+            ASSERT_GE(index, 0) << member.name;
+            EXPECT_EQ(meta->property(index).typeId(), kind(member.type)) << member.name;
             continue;
         }
         int found = -1;
@@ -228,12 +250,15 @@ TEST_F(CardWidgetTest, MembersCanBeCalledByName) {
             if (meta->method(i).name() == member.name)
                 found = i;
         ASSERT_GE(found, 0) << member.name;
-        EXPECT_EQ(meta->method(found).parameterCount(), static_cast<int>(member.params.size()))
-            << member.name;
-        for (size_t p = 0; p < member.params.size(); ++p)
-            EXPECT_EQ(meta->method(found).parameterNames()[static_cast<int>(p)],
-                      member.params[p].name)
-                << member.name;
+        QMetaMethod method = meta->method(found);
+        EXPECT_EQ(method.returnType(), kind(member.type)) << member.name;
+        ASSERT_EQ(method.parameterCount(), static_cast<int>(member.params.size())) << member.name;
+        for (int p = 0; p < method.parameterCount(); ++p) {
+            const CardInterface::Param& param = member.params[static_cast<size_t>(p)];
+            EXPECT_EQ(method.parameterNames()[p], param.name) << member.name;
+            EXPECT_EQ(method.parameterType(p), kind(param.type))
+                << member.name << " " << param.name;
+        }
     }
 
     int result = -1;
