@@ -18,8 +18,10 @@ CardWidget::CardWidget(const CardServices& services, ModuleState& shared, QWidge
     bindSurface();
 }
 
-// The widgets go first: they show the control's models to the last.
+// The binder goes first, so no event of a closing widget reaches the control,
+// then the widgets, which show the control's models to the last.
 CardWidget::~CardWidget() {
+    delete binder_;
     const QObjectList children = this->children();
     qDeleteAll(children);
 }
