@@ -49,7 +49,7 @@ std::string WriteCompany() {
 
 void RegisterPages() {
     static const std::string company = WriteCompany();
-    static const std::string page = PrivatePageDir() + "/bench-page.htm";
+    static const std::string page = FromUtf8(PrivatePageDir() + "/bench-page.htm");
     auto show = [](BenchCard& bench) {
         Card& card = bench.card();
         card.UserControl_InitProperties(nullptr);

@@ -2,6 +2,7 @@
 
 #include "control/CardForms.h"
 #include "control/Surface.h"
+#include "pictures/ItemPicsForm.h"
 #include "fixfiles/AccountsFile.h"
 #include "fixfiles/ItemsFile.h"
 #include "fixfiles/ReadStock.h"
@@ -33,7 +34,12 @@ Card::Card(const CardServices& services, ModuleState& shared)
     buildControls();
 }
 
-Card::~Card() = default;
+Card::~Card() {
+    auto pictures = shared_.Forms.find("frmItemPics");
+    if (pictures != shared_.Forms.end())
+        if (auto* form = dynamic_cast<ItemPicsForm*>(pictures->second.get()))
+            form->detach(*this);
+}
 
 void Card::buildControls() {
     if (shared_.DocTypes[0].code == 0)
@@ -115,7 +121,7 @@ void Card::UserControl_InitProperties(Container* container) {
         uint8_t load = 2;
         SetGetRegParams(load);
     });
-    IgnoringErrors([&] { form("frmItemPics"); });
+    IgnoringErrors([&] { dynamic_cast<ItemPicsForm&>(form("frmItemPics")).attach(*this); });
 }
 
 Variant Card::SetAccountKey() const {

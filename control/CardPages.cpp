@@ -127,7 +127,8 @@ void Card::PrintButt_Click() {
         if (WritePage(path))
             services_.browser.Open(path);
     } catch (const std::exception& e) {
-        services_.messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("תקלה"), e.what());
+        services_.messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("תקלה"),
+                                FromUtf8(e.what()));
     }
 }
 

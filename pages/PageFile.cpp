@@ -1,5 +1,6 @@
 #include "pages/PageFile.h"
 
+#include "platform/Encoding.h"
 #include "platform/Error.h"
 
 #include <cerrno>
@@ -42,19 +43,20 @@ void WriteAll(int fd, const std::string& text, const std::string& path) {
 void PageFile::commit() const {
     if (path_.empty())
         throw Error("No page file name was given");
-    std::string temp = DirectoryOf(path_) + "/.dvprint-XXXXXX";
+    std::string native = ToUtf8(path_);
+    std::string temp = DirectoryOf(native) + "/.dvprint-XXXXXX";
     int fd = ::mkstemp(temp.data());
     if (fd < 0)
-        throw Error("Could not write the page " + path_ + ": " + Cause());
+        throw Error("Could not write the page " + native + ": " + Cause());
     try {
-        WriteAll(fd, text_, path_);
+        WriteAll(fd, text_, native);
         if (::fchmod(fd, 0600) != 0 || ::close(fd) != 0) {
             fd = -1;
-            throw Error("Could not write the page " + path_ + ": " + Cause());
+            throw Error("Could not write the page " + native + ": " + Cause());
         }
         fd = -1;
-        if (::rename(temp.c_str(), path_.c_str()) != 0)
-            throw Error("Could not write the page " + path_ + ": " + Cause());
+        if (::rename(temp.c_str(), native.c_str()) != 0)
+            throw Error("Could not write the page " + native + ": " + Cause());
     } catch (...) {
         if (fd >= 0)
             ::close(fd);
@@ -80,7 +82,7 @@ std::string PrivatePageDir() {
 }
 
 std::string PrintFilePath() {
-    return PrivatePageDir() + "/dvprint.htm";
+    return FromUtf8(PrivatePageDir() + "/dvprint.htm");
 }
 
 } // namespace dovrel

@@ -11,6 +11,7 @@ namespace dovrel {
 // stays as it was until the new page is complete.
 class PageFile {
 public:
+    // The path is code page 1255, as every path the control is given.
     explicit PageFile(std::string path) : path_(std::move(path)) {}
 
     void line(std::string_view text) {
@@ -33,7 +34,8 @@ private:
 // a link, not a directory, not the user's own or open to others.
 std::string PrivatePageDir();
 
-// Where the print button writes its page: "dvprint.htm" in that directory.
+// Where the print button writes its page: "dvprint.htm" in that directory,
+// in code page 1255 as the control's paths are.
 std::string PrintFilePath();
 
 } // namespace dovrel

@@ -80,8 +80,14 @@ void ItemPicsForm::buildControls() {
     }
 }
 
+Card& ItemPicsForm::card() const {
+    if (card_ == nullptr)
+        throw Error("The picture settings form has no control to work with");
+    return *card_;
+}
+
 Messages& ItemPicsForm::messages() const {
-    return card_->services().messages;
+    return card().services().messages;
 }
 
 void ItemPicsForm::showFailure(const std::exception& failure) const {
@@ -153,7 +159,7 @@ int32_t ItemPicsForm::RowRangeID(int32_t row) const {
 
 void ItemPicsForm::SetGetMoreParams(uint8_t Action) {
     for (const Setting& setting : kSettings)
-        card_->SetGetRegParam(Action, shared_.AppName, "Params", setting.key, this->*setting.box, 1,
+        card().SetGetRegParam(Action, shared_.AppName, "Params", setting.key, this->*setting.box, 1,
                               Variant(FromUtf8(setting.defaultUtf8)));
 }
 

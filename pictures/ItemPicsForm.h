@@ -25,6 +25,12 @@ public:
 
     // The control whose settings store and message boxes the form uses from now on.
     void attach(Card& card) { card_ = &card; }
+    // A control that goes away lets go of the form; until another control
+    // attaches it, the form's work that needs one is refused.
+    void detach(const Card& card) {
+        if (card_ == &card)
+            card_ = nullptr;
+    }
 
     // Resets the grid, loads the six settings, mirrors them into the module
     // state and fills the grid from the picture database.
@@ -70,6 +76,7 @@ private:
     void mirrorSettings();
     // The database file at the DBPath setting.
     std::string settingDbName() const;
+    Card& card() const;
     Messages& messages() const;
     // Shows a database failure under the title "תקלה".
     void showFailure(const std::exception& failure) const;

@@ -6,64 +6,13 @@
 #include <sqlite3.h>
 #include <unicode/ucol.h>
 #include <unicode/ustring.h>
-#include <unicode/uvernum.h>
-
-#include <dlfcn.h>
 
 #include <climits>
 #include <vector>
 
 namespace dovrel {
 
-// The core library links only ICU's common part; the collator lives in ICU's
-// i18n library, which is bound here on first use, with the version the headers
-// name. A program that already links it is served from its own copy.
-struct PictureCollation::Functions {
-    decltype(&ucol_open) open = nullptr;
-    decltype(&ucol_close) close = nullptr;
-    decltype(&ucol_setStrength) setStrength = nullptr;
-    decltype(&ucol_setAttribute) setAttribute = nullptr;
-    decltype(&ucol_strcollUTF8) strcollUTF8 = nullptr;
-    decltype(&ucol_getSortKey) getSortKey = nullptr;
-};
-
 namespace {
-
-#define DOVREL_NAME_OF(symbol) DOVREL_QUOTE(symbol)
-#define DOVREL_QUOTE(symbol) #symbol
-
-constexpr const char* kLibrary = "libicui18n.so." U_ICU_VERSION_SHORT;
-
-template <typename Function> void Bind(void* library, const char* name, Function& function) {
-    void* found = dlsym(RTLD_DEFAULT, name);
-    if (found == nullptr && library != nullptr)
-        found = dlsym(library, name);
-    if (found == nullptr)
-        throw Error(std::string("Cannot find ") + name + " in ICU's collation library " + kLibrary);
-    function = reinterpret_cast<Function>(found);
-}
-
-PictureCollation::Functions LoadFunctions() {
-    void* library = nullptr;
-    if (dlsym(RTLD_DEFAULT, DOVREL_NAME_OF(ucol_open)) == nullptr) {
-        library = dlopen(kLibrary, RTLD_NOW | RTLD_LOCAL);
-        if (library == nullptr)
-            throw Error(std::string("Cannot load ICU's collation library: ") + dlerror());
-    }
-    PictureCollation::Functions f;
-    Bind(library, DOVREL_NAME_OF(ucol_open), f.open);
-    Bind(library, DOVREL_NAME_OF(ucol_close), f.close);
-    Bind(library, DOVREL_NAME_OF(ucol_setStrength), f.setStrength);
-    Bind(library, DOVREL_NAME_OF(ucol_setAttribute), f.setAttribute);
-    Bind(library, DOVREL_NAME_OF(ucol_strcollUTF8), f.strcollUTF8);
-    Bind(library, DOVREL_NAME_OF(ucol_getSortKey), f.getSortKey);
-    return f; // the library stays loaded for the life of the process
-}
-
-const PictureCollation::Functions& Icu() {
-    static const PictureCollation::Functions functions = LoadFunctions();
-    return functions;
-}
 
 int CheckedLength(std::string_view text) {
     if (text.size() > static_cast<size_t>(INT_MAX / 4))
@@ -95,22 +44,22 @@ int CollateCallback(void* self, int sizeA, const void* a, int sizeB, const void*
 
 } // namespace
 
-PictureCollation::PictureCollation() : icu_(&Icu()) {
+PictureCollation::PictureCollation() {
     UErrorCode status = U_ZERO_ERROR;
-    collator_ = icu_->open("", &status); // the root order
+    collator_ = ucol_open("", &status); // the root order
     if (U_FAILURE(status) || collator_ == nullptr)
         throw Error(std::string("Cannot open ICU's root collation: ") + u_errorName(status));
-    icu_->setStrength(collator_, UCOL_SECONDARY);
-    icu_->setAttribute(collator_, UCOL_ALTERNATE_HANDLING, UCOL_NON_IGNORABLE, &status);
-    icu_->setAttribute(collator_, UCOL_NUMERIC_COLLATION, UCOL_OFF, &status);
+    ucol_setStrength(collator_, UCOL_SECONDARY);
+    ucol_setAttribute(collator_, UCOL_ALTERNATE_HANDLING, UCOL_NON_IGNORABLE, &status);
+    ucol_setAttribute(collator_, UCOL_NUMERIC_COLLATION, UCOL_OFF, &status);
     if (U_FAILURE(status)) {
-        icu_->close(collator_);
+        ucol_close(collator_);
         throw Error(std::string("Cannot set up ICU's root collation: ") + u_errorName(status));
     }
 }
 
 PictureCollation::~PictureCollation() {
-    icu_->close(collator_);
+    ucol_close(collator_);
 }
 
 const PictureCollation& PictureCollation::instance() {
@@ -124,7 +73,7 @@ int PictureCollation::compare(std::string_view a, std::string_view b) const {
 
 int PictureCollation::compareUtf8(std::string_view a, std::string_view b) const {
     UErrorCode status = U_ZERO_ERROR;
-    UCollationResult result = icu_->strcollUTF8(collator_, a.data(), CheckedLength(a), b.data(),
+    UCollationResult result = ucol_strcollUTF8(collator_, a.data(), CheckedLength(a), b.data(),
                                                 CheckedLength(b), &status);
     if (U_FAILURE(status))
         throw Error(std::string("Cannot compare two texts: ") + u_errorName(status));
@@ -135,7 +84,7 @@ std::string PictureCollation::sortKey(std::string_view text) const {
     std::u16string wide = ToUtf16(ToUtf8(text));
     std::vector<uint8_t> key(wide.size() * 4 + 16);
     for (;;) {
-        int32_t needed = icu_->getSortKey(collator_, wide.data(), static_cast<int32_t>(wide.size()),
+        int32_t needed = ucol_getSortKey(collator_, wide.data(), static_cast<int32_t>(wide.size()),
                                           key.data(), static_cast<int32_t>(key.size()));
         if (needed <= 0)
             throw Error("Cannot make the sort key of a text");

@@ -39,13 +39,9 @@ public:
     PictureCollation(const PictureCollation&) = delete;
     PictureCollation& operator=(const PictureCollation&) = delete;
 
-    // ICU's collation functions, bound when first needed.
-    struct Functions;
-
 private:
     PictureCollation();
 
-    const Functions* icu_ = nullptr;
     UCollator* collator_ = nullptr;
 };
 

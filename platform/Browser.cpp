@@ -1,5 +1,6 @@
 #include "platform/Browser.h"
 
+#include "platform/Encoding.h"
 #include "platform/Error.h"
 
 #include <cstring>
@@ -14,7 +15,7 @@ namespace dovrel {
 
 void XdgOpenBrowser::Open(const std::string& path) {
     std::string program = "xdg-open";
-    std::string argument = path;
+    std::string argument = ToUtf8(path);
     char* argv[] = {program.data(), argument.data(), nullptr};
     pid_t pid = 0;
     int error = posix_spawnp(&pid, program.c_str(), nullptr, nullptr, argv, environ);

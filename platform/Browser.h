@@ -10,6 +10,7 @@ namespace dovrel {
 class Browser {
 public:
     virtual ~Browser() = default;
+    // The path is code page 1255, as every path the control holds.
     virtual void Open(const std::string& path) = 0;
 };
 

@@ -107,9 +107,9 @@ int PrintCommand::run(std::ostream& out, std::ostream& err) {
     }
 
     if (!several) {
-        std::string path = options_.out.empty() ? PrintFilePath() : options_.out;
+        std::string path = options_.out.empty() ? PrintFilePath() : FromUtf8(options_.out);
         card.WritePage(path);
-        out << path << '\n';
+        out << ToUtf8(path) << '\n';
         if (options_.open)
             browser_.Open(path);
         return 0;
@@ -120,7 +120,7 @@ int PrintCommand::run(std::ostream& out, std::ostream& err) {
     int32_t row = card.cmbDocType.ListIndex();
     while (true) {
         std::string path = names.next(card.txtReference1.Text());
-        card.WritePage(path);
+        card.WritePage(FromUtf8(path));
         out << path << '\n' << std::flush;
         if (++written == options_.count)
             break;
