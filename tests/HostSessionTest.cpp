@@ -308,3 +308,32 @@ TEST_F(HostSessionTest, TheChooserAndTheAccountWindowAreScripted) {
 
 } // namespace
 } // namespace dovrel
+
+namespace dovrel {
+namespace {
+
+TEST_F(HostSessionTest, PrintingOpensThePageAndFormGridsTakeTyping) {
+    test::TempDir temp;
+    setenv("TMPDIR", temp.str().c_str(), 1);
+    TestCompany company(kCompany);
+    session.setToday({2026, 3, 4});
+    ask({"call", "ShowDoc", company.path().string(), 20, 2});
+    ask({"set", "CmbDocLang", 1});
+    json printed = ask({"click", "PrintButt"});
+    unsetenv("TMPDIR");
+    ASSERT_EQ(printed["opened"].size(), 1u) << printed;
+    std::string page = test::ReadAll(printed["opened"][0].get<std::string>());
+    EXPECT_NE(page.find("<Font class=TD1>03-04-2026</Font>"), std::string::npos);
+    EXPECT_FALSE(ask({"state"}).contains("opened")) << "each opening is told once";
+
+    // The picture settings form is loaded, hidden, at start-up.
+    ask({"set", "frmItemPics.ItemPicLines", 0, 1, "key"});
+    EXPECT_EQ(ask({"get", "frmItemPics.ItemPicLines"})["value"][0][1], "key");
+    EXPECT_TRUE(ask({"select", "frmItemPics.ItemPicLines", 0})["ok"]);
+    EXPECT_FALSE(ask({"select", "frmItemPics.ItemPicLines", 5})["ok"]);
+    EXPECT_FALSE(ask({"set", "frmItemPics.ItemPicLines", 0, 9, "x"})["ok"]);
+    EXPECT_EQ(ask({"set", "txtTitle", 0, 0, "x"})["error"], "txtTitle has no cells");
+}
+
+} // namespace
+} // namespace dovrel

@@ -83,9 +83,23 @@ void CardMembers::Select(Card& card, const std::string& name, const HostArgs& ar
         box.setSelLength(length);
         return;
     }
+    case ControlKind::Grid:
+        args.expectCount(2);
+        static_cast<Grid&>(control).setRow(
+            static_cast<int32_t>(args.integer(1, "row", 0, kInt32Max)));
+        return;
     default:
         throw Error(name + " cannot be selected");
     }
+}
+
+void CardMembers::SetCell(Card& card, const std::string& name, const HostArgs& args) {
+    Control& control = Find(card, name);
+    if (control.kind() != ControlKind::Grid)
+        throw Error(name + " has no cells");
+    static_cast<Grid&>(control).setTextMatrix(
+        static_cast<int32_t>(args.integer(1, "row", 0, kInt32Max)),
+        static_cast<int32_t>(args.integer(2, "column", 0, kInt32Max)), args.text(3, "text"));
 }
 
 nlohmann::json CardMembers::Get(Card& card, const std::string& name) {

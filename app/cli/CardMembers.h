@@ -22,7 +22,11 @@ public:
     static void SetControl(Control& control, const nlohmann::json& value);
     // ["select", NAME, INDEX] picks the entry of a list; ["select", NAME,
     // START, LENGTH] selects part of a text box's text.
+    // ["select", GRID, ROW] makes a row the grid's current row.
     static void Select(Card& card, const std::string& name, const HostArgs& args);
+    // Types a text into one cell of a grid: the arguments after the name
+    // are the row, the column and the text.
+    static void SetCell(Card& card, const std::string& name, const HostArgs& args);
     // The control of the card, or of a loaded form for "FORM.CONTROL".
     static Control& Find(Card& card, const std::string& name);
     // The loaded form of that name.

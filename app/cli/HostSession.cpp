@@ -90,6 +90,13 @@ std::optional<std::string> HostSession::handle(std::string_view line) {
     }
     if (!reply.contains("state"))
         reply["messages"] = StateJson::Messages(messages_.take());
+    // The pages the call opened in the browser, which the host opens or reads.
+    if (!browser_.opened.empty()) {
+        reply["opened"] = json::array();
+        for (const std::string& path : browser_.opened)
+            reply["opened"].push_back(StateJson::Text(path));
+        browser_.opened.clear();
+    }
     return StateJson::Dump(reply);
 }
 
@@ -109,6 +116,13 @@ json HostSession::answer(const json& request) {
     json reply = run(request);
     reply["ok"] = true;
     reply["messages"] = StateJson::Messages(messages_.take());
+    // The pages the call opened in the browser, which the host opens or reads.
+    if (!browser_.opened.empty()) {
+        reply["opened"] = json::array();
+        for (const std::string& path : browser_.opened)
+            reply["opened"].push_back(StateJson::Text(path));
+        browser_.opened.clear();
+    }
     reply["state"] = StateJson::Build(card());
     return reply;
 }
@@ -129,6 +143,10 @@ int HostSession::serve(std::istream& in, std::ostream& out) {
 
 void HostSession::addCardCommands() {
     addCommand("set", [](HostSession& session, const HostArgs& args) {
+        if (args.size() == 4) {
+            CardMembers::SetCell(session.card(), args.text(0, "name"), args);
+            return json::object();
+        }
         args.expectCount(2);
         CardMembers::Set(session.card(), args.text(0, "name"), args.at(1));
         return json::object();
