@@ -16,23 +16,10 @@ constexpr uint32_t kSearchLabelColor = 0x000080;
 
 using Kind = ControlKind;
 
-ControlDesign Plain(const char* name, Kind kind, const char* captionUtf8, int32_t left, int32_t top,
-                    int32_t width, int32_t height) {
-    ControlDesign d;
-    d.name = name;
-    d.kind = kind;
-    d.caption = FromUtf8(captionUtf8);
-    d.left = left;
-    d.top = top;
-    d.width = width;
-    d.height = height;
-    return d;
-}
-
 ControlDesign Field(const char* name, Kind kind, int32_t left, int32_t top, int32_t width,
                     bool grey = false) {
-    ControlDesign d =
-        Plain(name, kind, "", left, top, width, kind == Kind::ComboBox ? kListHeight : kTextHeight);
+    ControlDesign d = Design(name, kind, "", left, top, width,
+                             kind == Kind::ComboBox ? kListHeight : kTextHeight);
     d.grey = grey;
     return d;
 }
@@ -41,8 +28,8 @@ ControlDesign Field(const char* name, Kind kind, int32_t left, int32_t top, int3
 // right to left), its width taken from the caption's length.
 ControlDesign CaptionLabel(const char* name, const char* captionUtf8, const ControlDesign& field,
                            bool searches = false) {
-    ControlDesign d = Plain(name, Kind::Label, captionUtf8, field.left + field.width + 60,
-                            field.top + 30, 0, kLabelHeight);
+    ControlDesign d = Design(name, Kind::Label, captionUtf8, field.left + field.width + 60,
+                             field.top + 30, 0, kLabelHeight);
     d.width = static_cast<int32_t>(d.caption.size()) * 100 + 100;
     d.labelFor = field.name;
     d.bold = searches;
@@ -53,7 +40,7 @@ ControlDesign CaptionLabel(const char* name, const char* captionUtf8, const Cont
 ControlDesign Command(const char* name, const char* captionUtf8, const char* tipUtf8,
                       const char* picture, int32_t left, int32_t top, int32_t width,
                       int32_t height) {
-    ControlDesign d = Plain(name, Kind::Button, captionUtf8, left, top, width, height);
+    ControlDesign d = Design(name, Kind::Button, captionUtf8, left, top, width, height);
     d.toolTip = FromUtf8(tipUtf8);
     d.picture = picture;
     return d;
@@ -61,7 +48,7 @@ ControlDesign Command(const char* name, const char* captionUtf8, const char* tip
 
 ControlDesign Check(const char* name, const char* captionUtf8, int32_t left, int32_t top,
                     int32_t width) {
-    return Plain(name, Kind::CheckBox, captionUtf8, left, top, width, kCheckHeight);
+    return Design(name, Kind::CheckBox, captionUtf8, left, top, width, kCheckHeight);
 }
 
 std::vector<std::string> Entries(std::initializer_list<const char*> utf8) {
@@ -106,7 +93,7 @@ void AddHeader(std::vector<ControlDesign>& s) {
 }
 
 void AddLinesAndTotals(std::vector<ControlDesign>& s) {
-    s.push_back(Plain("DocLines", Kind::Grid, "", 120, 2520, 10215, 2115));
+    s.push_back(Design("DocLines", Kind::Grid, "", 120, 2520, 10215, 2115));
     ControlDesign totalVat = Field("txtTotalVat", Kind::TextBox, 240, 4800, 1815, true);
     ControlDesign vat = Field("txtVatValue", Kind::TextBox, 240, 5040, 1815, true);
     ControlDesign total = Field("txtTotal1", Kind::TextBox, 240, 5280, 1815, true);
@@ -116,8 +103,8 @@ void AddLinesAndTotals(std::vector<ControlDesign>& s) {
     s.push_back(CaptionLabel("Label9", ":מע\"מ", vat));
     s.push_back(total);
     s.push_back(CaptionLabel("Label10", ":סה\"כ כולל מע\"מ", total));
-    s.push_back(Plain("ProgressFrame", Kind::Shape, "", 3720, 4680, 3015, 495));
-    s.push_back(Plain("ProgressFill", Kind::Shape, "", 3720, 4680, 0, 495));
+    s.push_back(Design("ProgressFrame", Kind::Shape, "", 3720, 4680, 3015, 495));
+    s.push_back(Design("ProgressFill", Kind::Shape, "", 3720, 4680, 0, 495));
     s.push_back(Command("FirstButt", "הראשון", "המסמך הראשון", "first", 9420, 4740, 855, 615));
     s.push_back(Command("PrevButt", "הקודם", "המסמך הקודם", "previous", 8520, 4800, 735, 495));
     s.push_back(Command("NextButt", "הבא", "המסמך הבא", "next", 7740, 4800, 735, 495));
@@ -150,10 +137,10 @@ void AddPageOptions(std::vector<ControlDesign>& s) {
 
 // The version text, the product caption and the frames around the groups.
 void AddDecoration(std::vector<ControlDesign>& s) {
-    s.push_back(Plain("Label17", Kind::Label, "גירסה 5.0130", 180, 6960, 1335, kLabelHeight));
-    s.push_back(Plain("Label12", Kind::Label, "דוברל", 5160, 5280, 700, kLabelHeight));
-    s.push_back(Plain("Label6", Kind::Label, "-", 4980, 5280, 180, kLabelHeight));
-    s.push_back(Plain("Label13", Kind::Label, "לחשבשבת", 4020, 5280, 960, kLabelHeight));
+    s.push_back(Design("Label17", Kind::Label, "גירסה 5.0130", 180, 6960, 1335, kLabelHeight));
+    s.push_back(Design("Label12", Kind::Label, "דוברל", 5160, 5280, 700, kLabelHeight));
+    s.push_back(Design("Label6", Kind::Label, "-", 4980, 5280, 180, kLabelHeight));
+    s.push_back(Design("Label13", Kind::Label, "לחשבשבת", 4020, 5280, 960, kLabelHeight));
     static const int32_t frames[14][4] = {
         {120, 60, 10215, 600},    {120, 660, 10215, 1800},  {180, 1440, 1755, 855},
         {120, 4620, 10215, 1080}, {180, 4740, 3480, 840},   {3660, 4620, 3135, 615},
@@ -162,11 +149,24 @@ void AddDecoration(std::vector<ControlDesign>& s) {
         {8760, 6720, 1575, 420},  {120, 2460, 10215, 2235},
     };
     for (int i = 0; i < 14; ++i)
-        s.push_back(Plain(("Shape" + std::to_string(i + 1)).c_str(), Kind::Shape, "", frames[i][0],
-                          frames[i][1], frames[i][2], frames[i][3]));
+        s.push_back(Design(("Shape" + std::to_string(i + 1)).c_str(), Kind::Shape, "", frames[i][0],
+                           frames[i][1], frames[i][2], frames[i][3]));
 }
 
 } // namespace
+
+ControlDesign Design(std::string name, ControlKind kind, const char* captionUtf8, int32_t left,
+                     int32_t top, int32_t width, int32_t height) {
+    ControlDesign d;
+    d.name = std::move(name);
+    d.kind = kind;
+    d.caption = FromUtf8(captionUtf8);
+    d.left = left;
+    d.top = top;
+    d.width = width;
+    d.height = height;
+    return d;
+}
 
 const std::vector<ControlDesign>& CardSurface() {
     static const std::vector<ControlDesign> surface = [] {

@@ -30,6 +30,11 @@ constexpr int32_t kCardDesignWidth = 10440;
 constexpr int32_t kCardDesignHeight = 7680;
 constexpr const char* kCardFont = "Arial";
 
+// One control of a design table: its name, kind, caption (given in UTF-8)
+// and place in twips; the other fields are left at their defaults.
+ControlDesign Design(std::string name, ControlKind kind, const char* captionUtf8, int32_t left,
+                     int32_t top, int32_t width, int32_t height);
+
 // Every child control of the viewer, labels and frames included, in tab order.
 const std::vector<ControlDesign>& CardSurface();
 // The design of one control, or nullptr.

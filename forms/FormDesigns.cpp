@@ -11,19 +11,6 @@ using Kind = ControlKind;
 constexpr int32_t kMargin = 120;
 constexpr int32_t kButtonHeight = 375;
 
-ControlDesign Design(const std::string& name, Kind kind, const char* captionUtf8, int32_t left,
-                     int32_t top, int32_t width, int32_t height) {
-    ControlDesign d;
-    d.name = name;
-    d.kind = kind;
-    d.caption = FromUtf8(captionUtf8);
-    d.left = left;
-    d.top = top;
-    d.width = width;
-    d.height = height;
-    return d;
-}
-
 ControlDesign CaptionFor(const std::string& name, const char* captionUtf8,
                          const ControlDesign& field, int32_t formWidth) {
     int32_t left = field.left + field.width + 60;

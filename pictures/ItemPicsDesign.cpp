@@ -15,63 +15,50 @@ constexpr int32_t kButtonWidth = 1500;
 
 using Kind = ControlKind;
 
-ControlDesign Plain(const char* name, Kind kind, const char* captionUtf8, int32_t left, int32_t top,
-                    int32_t width, int32_t height) {
-    ControlDesign d;
-    d.name = name;
-    d.kind = kind;
-    d.caption = FromUtf8(captionUtf8);
-    d.left = left;
-    d.top = top;
-    d.width = width;
-    d.height = height;
-    return d;
-}
-
 ControlDesign Field(const char* name, int32_t left, int32_t top, int32_t width) {
-    return Plain(name, Kind::TextBox, "", left, top, width, kTextHeight);
+    return Design(name, Kind::TextBox, "", left, top, width, kTextHeight);
 }
 
 // A caption label just right of the field it names, as wide as its caption.
 ControlDesign CaptionLabel(const char* name, const char* captionUtf8, const ControlDesign& field) {
-    ControlDesign d = Plain(name, Kind::Label, captionUtf8, field.left + field.width + 60,
-                            field.top + 30, 0, kLabelHeight);
+    ControlDesign d = Design(name, Kind::Label, captionUtf8, field.left + field.width + 60,
+                             field.top + 30, 0, kLabelHeight);
     d.width = static_cast<int32_t>(d.caption.size()) * 100 + 100;
     d.labelFor = field.name;
     return d;
 }
 
 ControlDesign Command(const char* name, const char* captionUtf8, int32_t left, int32_t top) {
-    return Plain(name, Kind::Button, captionUtf8, left, top, kButtonWidth, kButtonHeight);
+    return Design(name, Kind::Button, captionUtf8, left, top, kButtonWidth, kButtonHeight);
 }
 
 void AddHeader(std::vector<ControlDesign>& s) {
-    s.push_back(Plain("Frame1", Kind::Shape, "", 120, 120, 8160, 840));
+    s.push_back(Design("Frame1", Kind::Shape, "", 120, 120, 8160, 840));
     s.push_back(Field("txtLogoFile", 240, 240, 6000));
     s.push_back(CaptionLabel("Label1", "קובץ לוגו:", s.back()));
     s.push_back(Field("txtCompTitle", 240, 600, 6000));
     s.push_back(CaptionLabel("Label2", "פרטי כותרת:", s.back()));
     s.push_back(
-        Plain("Label3", Kind::Label, "שיוך תמונות לפריטים:", 5880, 1080, 2400, kLabelHeight));
+        Design("Label3", Kind::Label, "שיוך תמונות לפריטים:", 5880, 1080, 2400, kLabelHeight));
 }
 
 void AddPaths(std::vector<ControlDesign>& s) {
-    s.push_back(Plain("Frame2", Kind::Shape, "", 120, 1380, 8160, 1260));
+    s.push_back(Design("Frame2", Kind::Shape, "", 120, 1380, 8160, 1260));
     s.push_back(Field("txtDBPath", 1800, 1500, 4440));
     s.push_back(CaptionLabel("Label4", ":מחיצת הגדרות", s.back()));
     s.push_back(Command("CmdInitDB", "איתחול הגדרות", 240, 1455));
     s.push_back(Field("txtPicPath", 1800, 1860, 4440));
     s.push_back(CaptionLabel("Label5", ":מחיצת תמונות", s.back()));
     s.push_back(Field("txtPicX", 4560, 2220, 660));
-    s.push_back(Plain("Label6", Kind::Label, "X", 5280, 2250, 240, kLabelHeight));
+    s.push_back(Design("Label6", Kind::Label, "X", 5280, 2250, 240, kLabelHeight));
     s.push_back(Field("txtPicY", 5580, 2220, 660));
     s.push_back(CaptionLabel("Label7", "גודל תמונה:", s.back()));
 }
 
 void AddRanges(std::vector<ControlDesign>& s) {
     s.push_back(
-        Plain("Label8", Kind::Label, ":תמונות לקבוצות פריטים ", 5280, 2760, 3000, kLabelHeight));
-    s.push_back(Plain("ItemPicLines", Kind::Grid, "", 120, 3060, 8160, 2640));
+        Design("Label8", Kind::Label, ":תמונות לקבוצות פריטים ", 5280, 2760, 3000, kLabelHeight));
+    s.push_back(Design("ItemPicLines", Kind::Grid, "", 120, 3060, 8160, 2640));
     const char* buttons[][2] = {{"CmdDelete", "מחק מהרשימה"},
                                 {"CmdNew", "שורה חדשה"},
                                 {"CmdUpdate", "שמור שינויים"},

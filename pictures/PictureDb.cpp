@@ -5,6 +5,7 @@
 #include "platform/Error.h"
 #include "platform/FileSystem.h"
 #include "platform/Messages.h"
+#include "platform/Sqlite.h"
 
 #include <sqlite3.h>
 
@@ -66,113 +67,22 @@ const std::array<FieldRule, 5> kFieldRules = {{
     {"PicFile", "picture file", &PictureRange::PicFile, PictureDb::kPicFileSize},
 }};
 
-// One connection for the length of one call; closing it rolls back whatever
-// was not committed. `failure` starts every error description.
-class Connection {
+// A connection that knows the pictures' text order before it touches the
+// table, as every connection writing it must.
+class Connection : public SqliteConnection {
 public:
     Connection(const std::string& fsPath, int flags, std::chrono::milliseconds timeout,
                std::string failure)
-        : failure_(std::move(failure)) {
-        if (sqlite3_open_v2(fsPath.c_str(), &db_, flags, nullptr) != SQLITE_OK) {
-            std::string reason = describe();
-            sqlite3_close_v2(db_);
-            throw Error(failure_ + ": " + reason);
-        }
-        sqlite3_extended_result_codes(db_, 1);
-        sqlite3_busy_timeout(db_, static_cast<int>(timeout.count()));
+        : SqliteConnection(fsPath, flags, timeout, std::move(failure)) {
         try {
-            PictureCollation::instance().registerWith(db_);
+            PictureCollation::instance().registerWith(handle());
         } catch (const Error& e) {
-            sqlite3_close_v2(db_);
-            throw Error(failure_ + ": " + e.what());
+            throw Error(this->failure() + ": " + e.what());
         }
     }
-    ~Connection() { sqlite3_close_v2(db_); }
-    Connection(const Connection&) = delete;
-    Connection& operator=(const Connection&) = delete;
-
-    [[noreturn]] void fail(const std::string& where = {}) const {
-        throw Error(failure_ + ": " + where + describe());
-    }
-    void exec(const char* sql) {
-        if (sqlite3_exec(db_, sql, nullptr, nullptr, nullptr) != SQLITE_OK)
-            fail();
-    }
-    // Closes now, so that a failure to finish writing is reported.
-    void close() {
-        if (sqlite3_close(db_) != SQLITE_OK)
-            fail();
-        db_ = nullptr;
-    }
-    int code() const { return sqlite3_errcode(db_) & 0xff; }
-    sqlite3* handle() const { return db_; }
-    const std::string& failure() const { return failure_; }
-
-private:
-    std::string describe() const {
-        if (db_ == nullptr)
-            return "out of memory";
-        std::string reason = sqlite3_errmsg(db_);
-        int code = sqlite3_errcode(db_) & 0xff, err = sqlite3_system_errno(db_);
-        if (err != 0 && (code == SQLITE_CANTOPEN || code == SQLITE_IOERR || code == SQLITE_FULL))
-            reason += std::string(" (") + std::strerror(err) + ")";
-        return reason;
-    }
-
-    sqlite3* db_ = nullptr;
-    std::string failure_;
 };
 
-class Statement {
-public:
-    Statement(Connection& db, const char* sql) : db_(db) {
-        if (sqlite3_prepare_v2(db.handle(), sql, -1, &stmt_, nullptr) != SQLITE_OK)
-            db.fail();
-    }
-    ~Statement() { sqlite3_finalize(stmt_); }
-    Statement(const Statement&) = delete;
-    Statement& operator=(const Statement&) = delete;
-
-    void bind(int index, int64_t value) {
-        if (sqlite3_bind_int64(stmt_, index, value) != SQLITE_OK)
-            db_.fail();
-    }
-    // A code page 1255 text as UTF-8, or Null.
-    void bind(int index, const std::optional<std::string>& text) {
-        int rc = SQLITE_OK;
-        if (!text) {
-            rc = sqlite3_bind_null(stmt_, index);
-        } else {
-            std::string utf8 = ToUtf8(*text);
-            rc = sqlite3_bind_text(stmt_, index, utf8.data(), static_cast<int>(utf8.size()),
-                                   SQLITE_TRANSIENT);
-        }
-        if (rc != SQLITE_OK)
-            db_.fail();
-    }
-    bool step(const std::string& where = {}) {
-        int rc = sqlite3_step(stmt_);
-        if (rc != SQLITE_ROW && rc != SQLITE_DONE)
-            db_.fail(where);
-        return rc == SQLITE_ROW;
-    }
-    void reset() {
-        sqlite3_reset(stmt_);
-        sqlite3_clear_bindings(stmt_);
-    }
-    int64_t integer(int column) const { return sqlite3_column_int64(stmt_, column); }
-    std::optional<std::string> text(int column) const {
-        if (sqlite3_column_type(stmt_, column) == SQLITE_NULL)
-            return std::nullopt;
-        const unsigned char* data = sqlite3_column_text(stmt_, column);
-        int size = sqlite3_column_bytes(stmt_, column);
-        return FromUtf8({reinterpret_cast<const char*>(data), static_cast<size_t>(size)});
-    }
-
-private:
-    Connection& db_;
-    sqlite3_stmt* stmt_ = nullptr;
-};
+using Statement = SqliteStatement;
 
 std::string SchemaProblem(Connection& db) {
     Statement info(db, "PRAGMA table_info(tItemPicture)");

@@ -2,6 +2,7 @@
 
 #include "platform/Encoding.h"
 #include "platform/Error.h"
+#include "platform/Sqlite.h"
 
 #include <sqlite3.h>
 
@@ -28,95 +29,19 @@ const char* const kCreateTable = "CREATE TABLE IF NOT EXISTS settings ("
                                  " value TEXT NOT NULL,"
                                  " PRIMARY KEY (app, section, key)) WITHOUT ROWID";
 
-// One connection for the length of one operation. `failure` starts every error
-// description, e.g. 'Cannot save setting "CompPath" to /home/x/.config/dovrel/settings.db'.
-class Database {
-public:
-    Database(const std::string& path, std::chrono::milliseconds timeout, std::string failure)
-        : failure_(std::move(failure)) {
-        if (sqlite3_open_v2(path.c_str(), &db_, SQLITE_OPEN_READWRITE, nullptr) != SQLITE_OK) {
-            std::string reason = describe();
-            sqlite3_close_v2(db_); // a failed open still holds a handle
-            throw Error(failure_ + ": " + reason);
-        }
-        sqlite3_extended_result_codes(db_, 1);
-        sqlite3_busy_timeout(db_, static_cast<int>(timeout.count()));
-    }
-    ~Database() { sqlite3_close_v2(db_); } // also rolls back an unfinished transaction
-    Database(const Database&) = delete;
-    Database& operator=(const Database&) = delete;
-
-    [[noreturn]] void fail() const { throw Error(failure_ + ": " + describe()); }
-    void exec(const char* sql) {
-        if (sqlite3_exec(db_, sql, nullptr, nullptr, nullptr) != SQLITE_OK)
-            fail();
-    }
-    sqlite3* handle() const { return db_; }
-    bool hasTable();
-
-private:
-    // SQLite's description of the last failure, with the system's reason when it has one.
-    std::string describe() const {
-        if (db_ == nullptr)
-            return "out of memory";
-        std::string reason = sqlite3_errmsg(db_);
-        int code = sqlite3_errcode(db_) & 0xff, err = sqlite3_system_errno(db_);
-        if (err != 0 && (code == SQLITE_CANTOPEN || code == SQLITE_IOERR))
-            reason += std::string(" (") + std::strerror(err) + ")";
-        return reason;
-    }
-
-    sqlite3* db_ = nullptr;
-    std::string failure_;
-};
-
-class Statement {
-public:
-    Statement(Database& db, const char* sql) : db_(db) {
-        if (sqlite3_prepare_v2(db.handle(), sql, -1, &stmt_, nullptr) != SQLITE_OK)
-            db.fail();
-    }
-    ~Statement() { sqlite3_finalize(stmt_); }
-    Statement(const Statement&) = delete;
-    Statement& operator=(const Statement&) = delete;
-
-    // Binds the code page 1255 texts, as UTF-8, to ?1, ?2 ...
-    template <typename... Texts> Statement& bind(const Texts&... texts) {
-        int index = 0;
-        (bindOne(++index, ToUtf8(texts)), ...);
-        return *this;
-    }
-    // True while there is a row to read.
-    bool step() {
-        int rc = sqlite3_step(stmt_);
-        if (rc != SQLITE_ROW && rc != SQLITE_DONE)
-            db_.fail();
-        return rc == SQLITE_ROW;
-    }
-    // The text of a column, in code page 1255.
-    std::string text(int column) const {
-        const unsigned char* data = sqlite3_column_text(stmt_, column);
-        int size = sqlite3_column_bytes(stmt_, column);
-        return data ? FromUtf8({reinterpret_cast<const char*>(data), static_cast<size_t>(size)})
-                    : std::string();
-    }
-
-private:
-    void bindOne(int index, const std::string& utf8) {
-        if (sqlite3_bind_text(stmt_, index, utf8.data(), static_cast<int>(utf8.size()),
-                              SQLITE_TRANSIENT) != SQLITE_OK)
-            db_.fail();
-    }
-
-    Database& db_;
-    sqlite3_stmt* stmt_ = nullptr;
-};
-
 // Reading sqlite_master also shows a file that is not a database.
-bool Database::hasTable() {
-    Statement query(*this,
-                    "SELECT 1 FROM sqlite_master WHERE type = 'table' AND name = 'settings'");
+bool HasTable(SqliteConnection& db) {
+    SqliteStatement query(db,
+                          "SELECT 1 FROM sqlite_master WHERE type = 'table' AND name = 'settings'");
     return query.step();
+}
+
+// Binds the texts to ?1, ?2 ... in order.
+template <typename... Texts>
+SqliteStatement& Bind(SqliteStatement& statement, const Texts&... texts) {
+    int index = 0;
+    (statement.bind(++index, std::optional<std::string>(texts)), ...);
+    return statement;
 }
 
 // Built by appending: g++ 12 at -O3 warns falsely about "..." + std::string.
@@ -174,13 +99,14 @@ std::optional<std::string> SqliteSettingsStore::FindSetting(const std::string& a
     std::string failure = "Cannot read setting " + Quoted(key) + " from " + path_;
     if (!Exists(path_, failure))
         return std::nullopt;
-    Database db(path_, busyTimeout_, failure);
-    if (!db.hasTable())
+    SqliteConnection db(path_, SQLITE_OPEN_READWRITE, busyTimeout_, failure);
+    if (!HasTable(db))
         return std::nullopt;
-    Statement query(db, "SELECT value FROM settings WHERE app = ?1 AND section = ?2 AND key = ?3");
-    if (!query.bind(app, section, key).step())
+    SqliteStatement query(
+        db, "SELECT value FROM settings WHERE app = ?1 AND section = ?2 AND key = ?3");
+    if (!Bind(query, app, section, key).step())
         return std::nullopt;
-    return query.text(0);
+    return query.text(0).value_or("");
 }
 
 void SqliteSettingsStore::SaveSetting(const std::string& app, const std::string& section,
@@ -189,12 +115,13 @@ void SqliteSettingsStore::SaveSetting(const std::string& app, const std::string&
     std::string failure = "Cannot save setting " + Quoted(key) + " to " + path_;
     MakeDirectory(failure);
     MakeFile(failure);
-    Database db(path_, busyTimeout_, failure);
+    SqliteConnection db(path_, SQLITE_OPEN_READWRITE, busyTimeout_, failure);
     db.exec("BEGIN IMMEDIATE");
     db.exec(kCreateTable);
-    Statement upsert(db, "INSERT INTO settings (app, section, key, value) VALUES (?1, ?2, ?3, ?4)"
-                         " ON CONFLICT (app, section, key) DO UPDATE SET value = excluded.value");
-    upsert.bind(app, section, key, value).step();
+    SqliteStatement upsert(db,
+                           "INSERT INTO settings (app, section, key, value) VALUES (?1, ?2, ?3, ?4)"
+                           " ON CONFLICT (app, section, key) DO UPDATE SET value = excluded.value");
+    Bind(upsert, app, section, key, value).step();
     db.exec("COMMIT");
 }
 
@@ -204,12 +131,12 @@ bool SqliteSettingsStore::DeleteSetting(const std::string& app, const std::strin
     std::string failure = "Cannot remove setting " + Quoted(key) + " from " + path_;
     if (!Exists(path_, failure))
         return false;
-    Database db(path_, busyTimeout_, failure);
+    SqliteConnection db(path_, SQLITE_OPEN_READWRITE, busyTimeout_, failure);
     db.exec("BEGIN IMMEDIATE");
-    if (!db.hasTable())
+    if (!HasTable(db))
         return false;
-    Statement erase(db, "DELETE FROM settings WHERE app = ?1 AND section = ?2 AND key = ?3");
-    erase.bind(app, section, key).step();
+    SqliteStatement erase(db, "DELETE FROM settings WHERE app = ?1 AND section = ?2 AND key = ?3");
+    Bind(erase, app, section, key).step();
     bool removed = sqlite3_changes(db.handle()) > 0;
     db.exec("COMMIT");
     return removed;
@@ -222,13 +149,13 @@ std::vector<SettingsStore::Entry> SqliteSettingsStore::ListSettings(const std::s
     std::vector<Entry> entries;
     if (!Exists(path_, failure))
         return entries;
-    Database db(path_, busyTimeout_, failure);
-    if (!db.hasTable())
+    SqliteConnection db(path_, SQLITE_OPEN_READWRITE, busyTimeout_, failure);
+    if (!HasTable(db))
         return entries;
-    Statement query(db, "SELECT key, value FROM settings WHERE app = ?1 AND section = ?2");
-    query.bind(app, section);
+    SqliteStatement query(db, "SELECT key, value FROM settings WHERE app = ?1 AND section = ?2");
+    Bind(query, app, section);
     while (query.step())
-        entries.emplace_back(query.text(0), query.text(1));
+        entries.emplace_back(query.text(0).value_or(""), query.text(1).value_or(""));
     SortByKey(entries);
     return entries;
 }
