@@ -5,6 +5,7 @@
 
 #include "control/Card.h"
 #include "platform/Encoding.h"
+#include "platform/SettingsStore.h"
 #include "tools/SampleWriter.h"
 
 #include <gtest/gtest.h>
@@ -12,6 +13,7 @@
 
 #include <filesystem>
 #include <fstream>
+#include <functional>
 #include <iterator>
 #include <memory>
 #include <random>
@@ -128,6 +130,34 @@ protected:
     RecordedMessages messages;
     std::unique_ptr<Card> card;
     std::unique_ptr<TestCompany> company;
+};
+
+// Shows a form and runs what the user does while it is open; then the window
+// closes as its close button would.
+template <class F = Form>
+class ScriptedForms : public FormPresenter {
+public:
+    void ShowModal(Form& form) override {
+        form.Show();
+        if (user)
+            user(dynamic_cast<F&>(form));
+        if (form.Visible())
+            form.QueryClose();
+    }
+    std::function<void(F&)> user;
+};
+
+// What a Card is started with: recorders and fixed values, forms shown to a script.
+template <class F = Form>
+struct CardDesk {
+    RecordedMessages messages;
+    MemorySettingsStore settings;
+    ScriptedForms<F> forms;
+    MemoryClipboard clipboard;
+    RecordingBrowser browser;
+    FixedClock clock{{2026, 12, 6}};
+    CardServices services{messages, settings, forms, clipboard, browser, clock};
+    ModuleState state;
 };
 
 } // namespace dovrel::test
