@@ -5,30 +5,15 @@
 #include "TestCompany.h"
 #include "control/Card.h"
 #include "platform/Error.h"
-#include "platform/SettingsStore.h"
 
 #include <gtest/gtest.h>
 
-#include <functional>
 #include <stdexcept>
 
 namespace dovrel {
 namespace {
 
 using test::U;
-using test::W;
-
-class ScriptedForms : public FormPresenter {
-public:
-    void ShowModal(Form& form) override {
-        form.Show();
-        if (user)
-            user(dynamic_cast<AccDetailsForm&>(form));
-        if (form.Visible())
-            form.QueryClose();
-    }
-    std::function<void(AccDetailsForm&)> user;
-};
 
 // A clipboard that another program holds.
 class BusyClipboard : public Clipboard {
@@ -37,19 +22,13 @@ public:
     std::string GetText() override { return {}; }
 };
 
-const char* const kAccounts = R"({"accounts": [
-    {"key": "1001", "phone": "03-1234567 054-7654321", "district": "מרכז", "details": "לקוח קבוע"},
-    {"key": "1002", "phone": "", "district": "צפון"}]})";
-
-class AccDetailsFormTest : public ::testing::Test {
+class AccDetailsFormTest : public ::testing::Test, protected test::CardDesk<AccDetailsForm> {
 protected:
-    AccDetailsFormTest() : company(kAccounts) {}
     // Shows the window for the account key and runs what the user does there.
     void show(const std::string& key, const std::function<void(AccDetailsForm&)>& user,
               Clipboard* board = nullptr) {
-        CardServices services{messages, settings, forms, board ? *board : clipboard,
-                              browser,  clock};
-        Card card(services, state);
+        CardServices with{messages, settings, forms, board ? *board : clipboard, browser, clock};
+        Card card(with, state);
         card.SetCompDir(Variant(company.compPath()));
         card.txtAccountKey.setText(key);
         bool shown = false;
@@ -60,18 +39,10 @@ protected:
         card.Click("cmdAccount");
         EXPECT_TRUE(shown);
     }
-    std::string lastMessage() const {
-        return messages.shown().empty() ? "" : U(messages.shown().back().text);
-    }
 
-    test::TestCompany company;
-    RecordedMessages messages;
-    MemorySettingsStore settings;
-    ScriptedForms forms;
-    MemoryClipboard clipboard;
-    RecordingBrowser browser;
-    FixedClock clock{{2026, 12, 6}};
-    ModuleState state;
+    test::TestCompany company{R"({"accounts": [
+    {"key": "1001", "phone": "03-1234567 054-7654321", "district": "מרכז", "details": "לקוח קבוע"},
+    {"key": "1002", "phone": "", "district": "צפון"}]})"};
 };
 
 TEST_F(AccDetailsFormTest, ASelectionIsCopiedAndOtherwiseTheWholeBox) {
@@ -85,8 +56,7 @@ TEST_F(AccDetailsFormTest, ASelectionIsCopiedAndOtherwiseTheWholeBox) {
     });
     EXPECT_EQ(clipboard.GetText(), "054-7654321");
     show("1001", [](AccDetailsForm& form) {
-        // Filled afresh: no selection left from the last showing.
-        EXPECT_EQ(form.txtPhone.SelLength(), 0);
+        EXPECT_EQ(form.txtPhone.SelLength(), 0); // filled afresh: no selection left over
         form.Click("cmdCopyText(2)");
     });
     EXPECT_EQ(U(clipboard.GetText()), "מרכז");
@@ -98,10 +68,10 @@ TEST_F(AccDetailsFormTest, AnEmptyBoxSaysSoAndKeepsTheWindowOpen) {
     show("1002", [&](AccDetailsForm& form) {
         form.Click("cmdCopyText(0)");
         EXPECT_TRUE(form.Visible());
-        EXPECT_EQ(lastMessage(), "לא נמצא טקסט להעתקה");
-        EXPECT_EQ(U(messages.shown().back().title), "שגיאה");
-        // A box the user emptied.
-        form.txtDistrict.setText("");
+        ASSERT_EQ(messages.shown().size(), 1u);
+        EXPECT_EQ(U(messages.shown()[0].title + ": " + messages.shown()[0].text),
+                  "שגיאה: לא נמצא טקסט להעתקה");
+        form.txtDistrict.setText(""); // a box the user emptied
         form.cmdCopyText_Click(2);
         EXPECT_TRUE(form.Visible());
         EXPECT_THROW(form.cmdCopyText_Click(3), Error);
@@ -121,13 +91,11 @@ TEST_F(AccDetailsFormTest, AnAccountNotFoundShowsEmptyWordsThatCanBeCopied) {
 
 TEST_F(AccDetailsFormTest, ABusyClipboardStillClosesTheWindow) {
     BusyClipboard busy;
-    show(
-        "1001",
-        [](AccDetailsForm& form) {
-            form.Click("cmdCopyText(1)");
-            EXPECT_FALSE(form.Visible());
-        },
-        &busy);
+    auto copy = [](AccDetailsForm& form) {
+        form.Click("cmdCopyText(1)");
+        EXPECT_FALSE(form.Visible());
+    };
+    show("1001", copy, &busy);
     EXPECT_TRUE(messages.shown().empty());
 }
 
