@@ -7,13 +7,11 @@
 #include "pictures/ItemPicsDesign.h"
 #include "pictures/PictureDb.h"
 #include "platform/Error.h"
-#include "platform/SettingsStore.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include <fstream>
-#include <functional>
 #include <set>
 
 namespace dovrel {
@@ -21,31 +19,22 @@ namespace {
 
 using test::U;
 using test::W;
+using ::testing::_;
+using ::testing::AllOf;
+using ::testing::ElementsAre;
 using ::testing::HasSubstr;
 using Text = std::optional<std::string>;
-
-// Shows the form and runs what the user does in it; then the window closes.
-class ScriptedForms : public FormPresenter {
-public:
-    void ShowModal(Form& form) override {
-        form.Show();
-        if (script)
-            script(form);
-        if (form.Visible())
-            form.QueryClose();
-    }
-    std::function<void(Form&)> script;
-};
 
 PictureRange R(Text fromKey, Text toKey, Text fromCode, Text toCode, Text pic) {
     return {0, fromKey, toKey, fromCode, toCode, pic};
 }
 
-class ItemPicsFormTest : public ::testing::Test {
+class ItemPicsFormTest : public ::testing::Test, protected test::CardDesk<> {
 protected:
-    // A control started with the picture database directory set to the test's.
-    ItemPicsForm& start() {
-        settings.SaveSetting("Dovrel", "Params", "DBPath", dbDir);
+    // A control started, by default with the picture database directory set to the test's.
+    ItemPicsForm& start(bool setDbDir = true) {
+        if (setDbDir)
+            settings.SaveSetting("Dovrel", "Params", "DBPath", dbDir);
         card = std::make_unique<Card>(services, state);
         card->UserControl_InitProperties(nullptr);
         return static_cast<ItemPicsForm&>(*state.Forms.at("frmItemPics"));
@@ -70,31 +59,21 @@ protected:
     test::TempDir dir;
     std::string dbDir = FromUtf8(dir.str() + "/");
     PictureDb db{dbDir + "Dovrel.def"};
-    RecordedMessages messages;
-    MemorySettingsStore settings;
-    ScriptedForms forms;
-    MemoryClipboard clipboard;
-    RecordingBrowser browser;
-    FixedClock clock{{2026, 12, 6}};
-    CardServices services{messages, settings, forms, clipboard, browser, clock};
-    ModuleState state;
     std::unique_ptr<Card> card;
 };
 
 TEST_F(ItemPicsFormTest, AFirstStartShowsTheDefaultsAndEveryControlOfTheDesign) {
-    card = std::make_unique<Card>(services, state);
-    card->UserControl_InitProperties(nullptr);
-    auto& form = static_cast<ItemPicsForm&>(*state.Forms.at("frmItemPics"));
+    ItemPicsForm& form = start(false);
     EXPECT_FALSE(form.Visible());
+    const std::vector<std::string> defaults = {
+        "c:\\logo.jpg", "רחוב הגפן 9, חיפה. טלפון: 04-8123456", "c:\\", "c:\\", "50", "50"};
     EXPECT_EQ(std::vector<std::string>({U(form.txtLogoFile.Text()), U(form.txtCompTitle.Text()),
                                         U(form.txtDBPath.Text()), U(form.txtPicPath.Text()),
                                         U(form.txtPicX.Text()), U(form.txtPicY.Text())}),
-              std::vector<std::string>({"c:\\logo.jpg", "רחוב הגפן 9, חיפה. טלפון: 04-8123456",
-                                        "c:\\", "c:\\", "50", "50"}));
+              defaults);
     EXPECT_EQ(std::vector<std::string>({U(state.LogoFile), U(state.CompTitle), state.DBPath,
                                         state.PicPath, state.PicX, state.PicY}),
-              std::vector<std::string>({"c:\\logo.jpg", "רחוב הגפן 9, חיפה. טלפון: 04-8123456",
-                                        "c:\\", "c:\\", "50", "50"}));
+              defaults);
     EXPECT_EQ(form.ItemPicLines.Rows(), 1);
     EXPECT_EQ(U(form.ItemPicLines.FormatString()),
               "<ממפתח פריט          |<עד מפתח פריט          |<מקוד מיון |<עד קוד מיון |"
@@ -111,9 +90,7 @@ TEST_F(ItemPicsFormTest, AFirstStartShowsTheDefaultsAndEveryControlOfTheDesign) 
         EXPECT_EQ(control->Caption(), design.caption) << design.name;
         EXPECT_LE(design.left + design.width, kItemPicsDesignWidth) << design.name;
         EXPECT_LE(design.top + design.height, kItemPicsDesignHeight) << design.name;
-        if (!design.labelFor.empty()) {
-            EXPECT_NE(FindItemPicsDesign(design.labelFor), nullptr) << design.name;
-        }
+        EXPECT_TRUE(design.labelFor.empty() || FindItemPicsDesign(design.labelFor)) << design.name;
     }
     EXPECT_EQ(form.controls().size(), ItemPicsDesign().size());
     EXPECT_EQ(U(form.findControl("CmdUpdate")->Caption()), "שמור שינויים");
@@ -128,6 +105,14 @@ TEST_F(ItemPicsFormTest, ButtonsThatNeedTheDatabaseSayWhenItIsMissing) {
         EXPECT_EQ(shown(), std::vector<std::string>{"שגיאה: קובץ ההגדרות אינו נמצא"}) << button;
     }
     EXPECT_EQ(form.ItemPicLines.Rows(), 1);
+
+    // The form outlives the control that made it, and a new control uses it.
+    card.reset();
+    Card second(services, state);
+    second.UserControl_InitProperties(nullptr);
+    forms.user = [](Form& shown) { shown.Click("CmdNew"); };
+    second.Click("CmdParams");
+    EXPECT_EQ(shown(), std::vector<std::string>{"שגיאה: קובץ ההגדרות אינו נמצא"});
 }
 
 TEST_F(ItemPicsFormTest, SavingWritesTheRowsAsRanges1ToNInOneTransaction) {
@@ -154,10 +139,9 @@ TEST_F(ItemPicsFormTest, SavingWritesTheRowsAsRanges1ToNInOneTransaction) {
     form.ItemPicLines.setTextMatrix(1, 4, "changed.jpg");
     form.ItemPicLines.setTextMatrix(2, 1, "");
     form.Click("CmdUpdate");
-    std::vector<std::string> failure = shown();
-    ASSERT_EQ(failure.size(), 1u);
-    EXPECT_THAT(failure[0], HasSubstr("תקלה: Cannot save the picture ranges to"));
-    EXPECT_THAT(failure[0], HasSubstr("row 2: the highest item key (ToItemKey) is empty"));
+    EXPECT_THAT(shown(), ElementsAre(AllOf(HasSubstr("תקלה: Cannot save the picture ranges to"),
+                                           HasSubstr("row 2: the highest item key (ToItemKey)"
+                                                     " is empty"))));
     EXPECT_EQ(db.rangesById(), stored);
 
     form.ItemPicLines.setTextMatrix(2, 1, "2");
@@ -219,9 +203,8 @@ TEST_F(ItemPicsFormTest, ReCreatingAsksAndKeepsAForeignFileUnlessConfirmedTwice)
     std::ofstream(dir.path() / "Dovrel.def", std::ios::binary | std::ios::trunc) << foreign;
     messages.queueAnswer(MsgAnswer::Yes);
     form.Click("CmdInitDB"); // the second question answered No
-    std::vector<std::string> asked = shown();
-    ASSERT_EQ(asked.size(), 2u);
-    EXPECT_THAT(asked[1], HasSubstr("אינו בסיס נתונים של תמונות (it is an Access (Jet) database"));
+    EXPECT_THAT(shown(), ElementsAre(_, HasSubstr("אינו בסיס נתונים של תמונות (it is an Access"
+                                                  " (Jet) database")));
     EXPECT_EQ(test::ReadAll(dir.path() / "Dovrel.def"), foreign);
 
     messages.queueAnswer(MsgAnswer::Yes);
@@ -247,7 +230,7 @@ TEST_F(ItemPicsFormTest, SettingsAreSavedByTheirButtonAndTypingIsDroppedOnClose)
     EXPECT_EQ(settings.GetSetting("Dovrel", "Params", "LogoFile", ""), "c:\\logo.jpg");
     EXPECT_EQ(state.PicPath, "/pics/");
 
-    forms.script = [](Form& shown) {
+    forms.user = [](Form& shown) {
         auto& f = static_cast<ItemPicsForm&>(shown);
         f.txtPicX.setText("99");
         f.Click("cmdClose");
@@ -261,10 +244,9 @@ TEST_F(ItemPicsFormTest, SettingsAreSavedByTheirButtonAndTypingIsDroppedOnClose)
 TEST_F(ItemPicsFormTest, ADamagedDatabaseAtLoadIsReportedAndLeavesTheGridEmpty) {
     std::ofstream(dir.path() / "Dovrel.def", std::ios::binary) << std::string(5000, 'x');
     ItemPicsForm& form = start();
-    std::vector<std::string> failure = shown();
-    ASSERT_EQ(failure.size(), 1u);
-    EXPECT_THAT(failure[0], HasSubstr("תקלה: Cannot read the picture database"));
-    EXPECT_THAT(failure[0], HasSubstr("not a picture database: it is not an SQLite database"));
+    EXPECT_THAT(shown(), ElementsAre(AllOf(HasSubstr("תקלה: Cannot read the picture database"),
+                                           HasSubstr("not a picture database: it is not an"
+                                                     " SQLite database"))));
     EXPECT_EQ(form.ItemPicLines.Rows(), 1);
 }
 
@@ -282,10 +264,9 @@ TEST_F(ItemPicsFormTest, TheControlGivesTheLinesOfADocumentTheirPictures) {
     start();
     int16_t type = 20;
     int32_t first = 2;
-    ASSERT_EQ(card->ShowDoc(company.compPath(), type, first), 0);
-    std::string compPath = company.compPath();
+    std::string compPath = company.compPath(), dbName = dbDir + "Dovrel.def";
+    ASSERT_EQ(card->ShowDoc(compPath, type, first), 0);
     card->ReadITM(compPath);
-    std::string dbName = dbDir + "Dovrel.def";
     card->FillPicPath(dbName);
     const CurrentDocument& doc = state.Doc;
     ASSERT_EQ(doc.lineCount, 3);
@@ -312,16 +293,6 @@ TEST_F(ItemPicsFormTest, APrintedDemoDocumentWithDrawingsShowsTheLinePictures) {
         EXPECT_THAT(page, HasSubstr("<img src='/pics/br.jpg'")) << language;
         EXPECT_THAT(page, HasSubstr("<img src='/pics/all.jpg'")) << language;
     }
-}
-
-TEST_F(ItemPicsFormTest, TheFormOutlivesTheControlThatMadeIt) {
-    start();
-    card.reset(); // the form stays in the module state
-    Card second(services, state);
-    second.UserControl_InitProperties(nullptr);
-    forms.script = [](Form& shown) { shown.Click("CmdNew"); };
-    second.Click("CmdParams");
-    EXPECT_EQ(shown(), std::vector<std::string>{"שגיאה: קובץ ההגדרות אינו נמצא"});
 }
 
 } // namespace
