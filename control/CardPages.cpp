@@ -63,7 +63,7 @@ PageView Card::pageView(std::string title) {
 void Card::CreateHTML(std::string& pFileName, int16_t& pDocFormat) {
     PageSettings settings = preparePage();
     PageView view = pageView(txtTitle.Text().empty() ? cmbDocType.Text() : txtTitle.Text());
-    PageContext context{view, shared_.Doc, settings, services_.clock.Today(), pDocFormat};
+    PageContext context(view, shared_.Doc, settings, services_.clock.Today(), pDocFormat);
     PageFile page(pFileName);
     OpenPage open(*this, page);
     WriteHebrewPage(page, context);
@@ -80,7 +80,7 @@ void Card::CreateHTMLEng(std::string& pFileName, bool& pUseFName) {
         title = shared_.DocTypes[static_cast<size_t>(row)].englishTitle;
     }
     PageView view = pageView(std::move(title));
-    PageContext context{view, shared_.Doc, settings, services_.clock.Today(), kPricedPage};
+    PageContext context(view, shared_.Doc, settings, services_.clock.Today());
     PageFile page(pFileName);
     WriteEnglishPage(page, context, pUseFName, shared_.Company);
     page.commit();
@@ -111,10 +111,18 @@ bool Card::WritePage(const std::string& path) {
     int16_t format = kPricedPage;
     bool useForeignNames = ChkUseFName.Value() == 1;
     switch (CmbDocLang.ListIndex()) {
-    case 0: CreateHTML(file, format); return true;
-    case 1: CreateHTMLEng(file, useForeignNames); return true;
-    case 2: format = kPageWithoutAmounts; CreateHTML(file, format); return true;
-    default: return false;
+    case 0:
+        CreateHTML(file, format);
+        return true;
+    case 1:
+        CreateHTMLEng(file, useForeignNames);
+        return true;
+    case 2:
+        format = kPageWithoutAmounts;
+        CreateHTML(file, format);
+        return true;
+    default:
+        return false;
     }
 }
 

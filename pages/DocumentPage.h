@@ -8,6 +8,8 @@
 
 #include <cstdint>
 #include <string>
+#include <string_view>
+#include <vector>
 
 namespace dovrel {
 
@@ -38,7 +40,14 @@ struct PageView {
     bool showTotalFC = false;
 };
 
+// The two modes of the Hebrew page.
+constexpr int16_t kPricedPage = 0;
+constexpr int16_t kPageWithoutAmounts = 2;
+
 struct PageContext {
+    PageContext(const PageView& view, const CurrentDocument& doc, const PageSettings& settings,
+                CivilDate today, int16_t mode = kPricedPage);
+
     const PageView& view;
     const CurrentDocument& doc;
     const PageSettings& settings;
@@ -46,11 +55,9 @@ struct PageContext {
     // The Hebrew page's mode: 0 with amounts, 2 with a checkbox column
     // instead; any other mode has neither.
     int16_t mode = 0;
+    // The item keys of the document's lines, trimmed: entry i - 1 is line i.
+    std::vector<std::string_view> lineKeys;
 };
-
-// The two modes of the Hebrew page.
-constexpr int16_t kPricedPage = 0;
-constexpr int16_t kPageWithoutAmounts = 2;
 
 // The Hebrew page of the document on display, right to left.
 void WriteHebrewPage(PageFile& page, const PageContext& context);

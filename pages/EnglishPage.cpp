@@ -15,7 +15,8 @@ void WriteStyleAndCompany(PageFile& page, const PageContext& c) {
     page::WriteHead(page);
     page.line("  TD{font-size:10pt; font-weight=200; color: '#000000';font-family: Arial;}");
     page.line("  A {font-size:12pt;font-weight=600;text-decoration:'underline'; color:'#3300CC';}");
-    page.line("  A:hover{font-size:12pt;font-weight=600;text-decoration:'underline'; color:'#CC3300';}");
+    page.line(
+        "  A:hover{font-size:12pt;font-weight=600;text-decoration:'underline'; color:'#CC3300';}");
     page.line("  .TD1{font-size : 10pt; font-weight=600; color: '#000000';}");
     page.line("  .TD2{font-size : 10pt; font-weight=600; color: '#000000';}");
     page.line("  .TD3{font-size : 12pt; font-weight=600; color: '#000000';}");
@@ -47,8 +48,8 @@ void WriteHeading(PageFile& page, const PageContext& c) {
     page.line("<Font class=TD4>" + EscapeHtml(c.view.title) + "&nbsp;" +
               EscapeHtml(c.view.reference) + "</Font>");
     page.line("<br>");
-    page.line("<Font class=TD3>Date Produced:&nbsp;" + page::FormatShownDate(c.view.date, true, '/') +
-              "</Font>");
+    page.line("<Font class=TD3>Date Produced:&nbsp;" +
+              page::FormatShownDate(c.view.date, true, '/') + "</Font>");
     page.line("</div>");
 }
 
@@ -122,20 +123,32 @@ double WriteLineRows(PageFile& page, const PageContext& c, bool useForeignNames,
             std::string text;
             const char* align = "left";
             switch (col) {
-            case 2: text = EscapeHtml(Description(c, r, useForeignNames)); break;
-            case 3: text = c.view.details ? EscapeHtml(grid.TextMatrix(r, 3)) : ""; break;
+            case 2:
+                text = EscapeHtml(Description(c, r, useForeignNames));
+                break;
+            case 3:
+                text = c.view.details ? EscapeHtml(grid.TextMatrix(r, 3)) : "";
+                break;
             case 4:
-            case 5: text = EscapeHtml(grid.TextMatrix(r, col)); align = "right"; break;
-            case 6: text = EscapeHtml(CurrencyNames(amounts.currency, company).second); break;
+            case 5:
+                text = EscapeHtml(grid.TextMatrix(r, col));
+                align = "right";
+                break;
+            case 6:
+                text = EscapeHtml(CurrencyNames(amounts.currency, company).second);
+                break;
             case 7:
                 align = "right";
                 if (amounts.quantity > 0) {
-                    double total = amounts.quantity * amounts.price * (100 - amounts.discount) / 100;
+                    double total =
+                        amounts.quantity * amounts.price * (100 - amounts.discount) / 100;
                     text = FormatAmount(total);
                     sum += total;
                 }
                 break;
-            default: text = EscapeHtml(grid.TextMatrix(r, col)); break;
+            default:
+                text = EscapeHtml(grid.TextMatrix(r, col));
+                break;
             }
             WriteCell(page, align, text);
         }
@@ -156,7 +169,8 @@ void WriteTotals(PageFile& page, double discountPercent, double sum) {
         page.line("<TD align='right' class=TD1>" + value + "</TD>");
         page.line("</TR>");
     };
-    page.line("<TABLE rules='rows' align='right' width='100%' border='1' bordercolor='#000000' cellspacing='0'>");
+    page.line("<TABLE rules='rows' align='right' width='100%' border='1' bordercolor='#000000' "
+              "cellspacing='0'>");
     row("Total before Discount:", FormatAmount(sum));
     row("Discount:", FormatAmount(d * sum / 100));
     row("Total:", FormatAmount((100 - d) * sum / 100));

@@ -17,19 +17,23 @@ namespace {
 
 void WriteStyleAndCompany(PageFile& page, const PageContext& c) {
     page::WriteHead(page);
-    page.line("  TD{font-size:10pt; font-weight=200; color: '#000000';font-family: arial (Hebrew);}");
+    page.line(
+        "  TD{font-size:10pt; font-weight=200; color: '#000000';font-family: arial (Hebrew);}");
     page.line("  A {font-size:12pt;font-weight=600;text-decoration:'underline'; color:'#3300CC';}");
-    page.line("  A:hover{font-size:12pt;font-weight=600;text-decoration:'underline'; color:'#CC3300';}");
+    page.line(
+        "  A:hover{font-size:12pt;font-weight=600;text-decoration:'underline'; color:'#CC3300';}");
     page.line("  .TD1{font-size : 10pt; font-weight=600; color: #000000;}");
     page.line("  .TD1f{font-size : 10pt; font-weight=600; color: green;}");
     page.line("  .TD2{font-size : 10pt; font-weight=600; color: #000000;}");
     page.line("  .TD3{font-size : 12pt; font-weight=600; color: #000000;}");
     page.line("  .TD4{font-size : 16pt; font-weight=600; color: #000000;}");
-    page.line("  .TD5{font-size : 10pt; font-weight=800; color: #000000;font-family: arial (Hebrew); background: #EBEBEB}");
+    page.line("  .TD5{font-size : 10pt; font-weight=800; color: #000000;font-family: arial "
+              "(Hebrew); background: #EBEBEB}");
     page.line("</STYLE>");
     page.line("</HEAD>");
     page.line("<BODY BGCOLOR='#FFFFFF'>");
-    page.line("<table cellspacing='0' cellpadding='0' border='0' align='center' width='100%' dir='rtl'>");
+    page.line(
+        "<table cellspacing='0' cellpadding='0' border='0' align='center' width='100%' dir='rtl'>");
     if (!c.settings.logoFile.empty()) {
         page.line("<tr>");
         page.line("<td align='right' class=TD3>&nbsp;</td>");
@@ -86,7 +90,7 @@ void WriteAddressee(PageFile& page, const PageContext& c) {
 
 void WriteLinesHead(PageFile& page, const PageContext& c, bool priced) {
     auto head = [&page](const char* utf8Caption) {
-        page.line(H(std::string("    <td align='right' class=TD5>") + utf8Caption + "</td>"));
+        page.line("    <td align='right' class=TD5>" + H(utf8Caption) + "</td>");
     };
     page.line("<table rules='" + c.view.rules +
               "' width='100%' border='1' bordercolor='#000000' cellspacing='0'>");
@@ -159,9 +163,14 @@ void WriteTotalRow(PageFile& page, const std::string& valueCell, const std::stri
 
 void WriteTotals(PageFile& page, const PageContext& c) {
     const DocumentHeader& h = c.doc.header;
-    auto value = [](const std::string& text) { return "<TD align='right' class=TD1>" + text + "</TD>"; };
-    auto label = [](const char* utf8) { return H(std::string("<TD align='right' class=TD5>") + utf8 + "</TD>"); };
-    page.line("<TABLE rules='rows' align='left' width='100%' border='1' bordercolor='#000000' cellspacing='0'>");
+    auto value = [](const std::string& text) {
+        return "<TD align='right' class=TD1>" + text + "</TD>";
+    };
+    auto label = [](const char* utf8) {
+        return "<TD align='right' class=TD5>" + H(utf8) + "</TD>";
+    };
+    page.line("<TABLE rules='rows' align='left' width='100%' border='1' bordercolor='#000000' "
+              "cellspacing='0'>");
     WriteTotalRow(page, value(FormatAmount(h.totalBeforeDiscount)), label(": סהכ לפני הנחה"));
     WriteTotalRow(page, value(FormatAmount(h.discountPercent * h.totalBeforeDiscount / 100.0)),
                   H("<TD dir='ltr' align='right' class=TD5>הנחה : %") +

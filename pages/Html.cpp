@@ -7,28 +7,55 @@
 
 namespace dovrel {
 
-std::string EscapeHtml(std::string_view text) {
-    std::string out;
-    out.reserve(text.size());
-    for (char c : text) {
-        switch (c) {
-        case '&': out += "&amp;"; break;
-        case '<': out += "&lt;"; break;
-        case '>': out += "&gt;"; break;
-        case '"': out += "&quot;"; break;
-        case '\'': out += "&#39;"; break;
-        default: out += c; break;
-        }
+namespace {
+
+constexpr std::string_view kSpecial = "&<>\"'";
+
+void AppendEscaped(std::string& out, char c) {
+    switch (c) {
+    case '&':
+        out += "&amp;";
+        break;
+    case '<':
+        out += "&lt;";
+        break;
+    case '>':
+        out += "&gt;";
+        break;
+    case '"':
+        out += "&quot;";
+        break;
+    case '\'':
+        out += "&#39;";
+        break;
+    default:
+        out += c;
+        break;
     }
+}
+
+} // namespace
+
+std::string EscapeHtml(std::string_view text) {
+    if (text.find_first_of(kSpecial) == std::string_view::npos)
+        return std::string(text);
+    std::string out;
+    out.reserve(text.size() + 16);
+    for (char c : text)
+        AppendEscaped(out, c);
     return out;
 }
 
 std::string AsIsTable(std::string_view text) {
-    std::string out = "<table cellspacing='0' cellpadding='0' border='0' align='right' dir='rtl'>";
-    out += "<tr>";
+    std::string out;
+    out.reserve(80 + text.size() * 16);
+    out += "<table cellspacing='0' cellpadding='0' border='0' align='right' dir='rtl'><tr>";
     for (size_t i = text.size(); i-- > 0;) {
         out += "<td>";
-        out += text[i] == ' ' ? std::string("&nbsp;") : EscapeHtml(text.substr(i, 1));
+        if (text[i] == ' ')
+            out += "&nbsp;";
+        else
+            AppendEscaped(out, text[i]);
         out += "</td>";
     }
     out += "</tr></table>";
@@ -45,11 +72,16 @@ std::string RightCell(std::string_view value) {
 std::string RulesFor(int32_t listIndex) {
     switch (listIndex) {
     case -1:
-    case 0: return "all";
-    case 1: return "none";
-    case 2: return "rows";
-    case 3: return "cols";
-    default: return "";
+    case 0:
+        return "all";
+    case 1:
+        return "none";
+    case 2:
+        return "rows";
+    case 3:
+        return "cols";
+    default:
+        return "";
     }
 }
 

@@ -50,7 +50,8 @@ void PageFile::commit() const {
         throw Error("Could not write the page " + native + ": " + Cause());
     try {
         WriteAll(fd, text_, native);
-        if (::fchmod(fd, 0600) != 0 || ::close(fd) != 0) {
+        // mkstemp made the file with mode 0600, readable by this user alone.
+        if (::close(fd) != 0) {
             fd = -1;
             throw Error("Could not write the page " + native + ": " + Cause());
         }

@@ -6,8 +6,22 @@
 #include "platform/Encoding.h"
 #include "platform/Error.h"
 
+#include <algorithm>
 #include <charconv>
 #include <cstdio>
+#include <unordered_map>
+
+namespace dovrel {
+
+PageContext::PageContext(const PageView& view, const CurrentDocument& doc,
+                         const PageSettings& settings, CivilDate today, int16_t mode)
+    : view(view), doc(doc), settings(settings), today(today), mode(mode) {
+    int count = std::clamp<int>(doc.lineCount, 0, kMaxDocLines);
+    for (int i = 1; i <= count; ++i)
+        lineKeys.push_back(Trim(doc.lines[static_cast<size_t>(i)].itemKey));
+}
+
+} // namespace dovrel
 
 namespace dovrel::page {
 
@@ -17,15 +31,19 @@ std::string JoinDate(int year, int month, int day, bool monthFirst, char separat
     char text[32];
     int first = monthFirst ? month : day;
     int second = monthFirst ? day : month;
-    std::snprintf(text, sizeof text, "%02d%c%02d%c%04d", first, separator, second, separator,
-                  year);
+    std::snprintf(text, sizeof text, "%02d%c%02d%c%04d", first, separator, second, separator, year);
     return text;
 }
 
 } // namespace
 
-std::string H(std::string_view utf8) {
-    return FromUtf8(utf8);
+const std::string& H(const char* utf8) {
+    // The page's Hebrew words are literals: each is converted once.
+    thread_local std::unordered_map<const char*, std::string> converted;
+    auto [entry, added] = converted.try_emplace(utf8);
+    if (added)
+        entry->second = FromUtf8(utf8);
+    return entry->second;
 }
 
 void WriteHead(PageFile& page) {
@@ -70,12 +88,9 @@ const LineAmounts& AmountsOfRow(const PageContext& context, int32_t row) {
 
 const DocumentLine* LineOfRow(const PageContext& context, int32_t row) {
     std::string_view key = Trim(context.view.lines.TextMatrix(row, 1));
-    int count = std::min<int>(context.doc.lineCount, kMaxDocLines);
-    for (int i = 1; i <= count; ++i) {
-        const DocumentLine& line = context.doc.lines[static_cast<size_t>(i)];
-        if (EqualsNoCase(Trim(line.itemKey), key))
-            return &line;
-    }
+    for (size_t i = 0; i < context.lineKeys.size(); ++i)
+        if (EqualsNoCase(context.lineKeys[i], key))
+            return &context.doc.lines[i + 1];
     return nullptr;
 }
 
@@ -85,8 +100,7 @@ std::string DrawingText(const PageContext& context, int32_t row) {
         return "&nbsp;";
     const PageSettings& s = context.settings;
     return "<img src='" + EscapeHtml(s.picPath + TrimCopy(line->picFile)) + "' width='" +
-           EscapeHtml(s.picX) + "' height='" + EscapeHtml(s.picY) +
-           "' border='0' align='middle'>";
+           EscapeHtml(s.picX) + "' height='" + EscapeHtml(s.picY) + "' border='0' align='middle'>";
 }
 
 } // namespace dovrel::page

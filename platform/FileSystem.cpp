@@ -2,11 +2,10 @@
 
 #include "platform/Encoding.h"
 
+#include <dirent.h>
 #include <sys/stat.h>
 
 #include <algorithm>
-#include <filesystem>
-#include <vector>
 
 namespace dovrel {
 namespace {
@@ -25,18 +24,20 @@ bool Exists(const std::string& path) {
 
 // The entry of dir whose name equals name without regard to case, the
 // first in sorted order when there are several; empty when there is none.
+// Read with readdir: the directory may be large and this runs on every
+// lookup of a name that is not there as written.
 std::string MatchInDirectory(const std::string& dir, const std::string& name) {
-    std::vector<std::string> matches;
-    std::error_code ec;
-    std::filesystem::directory_iterator it(dir.empty() ? "." : dir, ec);
-    for (; !ec && it != std::filesystem::directory_iterator(); it.increment(ec)) {
-        std::string entry = it->path().filename().string();
-        if (SameNoCase(entry, name))
-            matches.push_back(entry);
-    }
-    if (matches.empty())
+    DIR* stream = ::opendir(dir.empty() ? "." : dir.c_str());
+    if (stream == nullptr)
         return {};
-    return *std::min_element(matches.begin(), matches.end());
+    std::string best;
+    while (const dirent* entry = ::readdir(stream)) {
+        std::string_view entryName = entry->d_name;
+        if (SameNoCase(entryName, name) && (best.empty() || entryName < best))
+            best = entryName;
+    }
+    ::closedir(stream);
+    return best;
 }
 
 } // namespace
@@ -45,7 +46,7 @@ std::string ResolvePath(std::string_view path) {
     std::string native = ToUtf8(path);
     std::replace(native.begin(), native.end(), '\\', '/');
     std::string resolved = native.starts_with('/') ? "/" : "";
-    bool matching = true;  // stays true while every component so far exists
+    bool matching = true; // stays true while every component so far exists
     size_t pos = 0;
     while (pos <= native.size()) {
         size_t slash = native.find('/', pos);
