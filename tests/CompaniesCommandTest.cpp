@@ -65,8 +65,8 @@ TEST(CompaniesCommandTest, ShowsAnAccountOrEmptyWords) {
     std::string dir = company.path().string();
     EXPECT_EQ(Account(dir, " ab12 ", false), "טלפונים: 03-1234567\nפרטים: לקוח\nשכונה: מרכז\n");
     EXPECT_EQ(json::parse(Account(dir, "nope", true)),
-              json({{"key", "nope"}, {"found", false}, {"phone", "ריק"}, {"details", "ריק"},
-                    {"district", "ריק"}}));
+              json::parse(R"({"key": "nope", "found": false, "phone": "ריק",
+                              "details": "ריק", "district": "ריק"})"));
     std::ostringstream out;
     EXPECT_THROW(AccountCommand({dir, "  ", false}).run(out), Error);
     EXPECT_THROW(AccountCommand({dir + "/missing", "AB12", false}).run(out), Error);

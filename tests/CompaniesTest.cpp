@@ -88,9 +88,9 @@ TEST(CompaniesTest, ScanFindsTheCompanyDirectoriesJustBelowTheMainDirectory) {
     // Whole paths, however long, and names filled to 20 bytes.
     EXPECT_GT(base.size(), 30u);
     // comp01 and upper share a name; the sort leaves them in this order.
-    EXPECT_EQ(Paths(table), (std::vector<std::string>{base + "/blank", base + "/short",
-                                                      base + "/comp02", base + "/upper",
-                                                      base + "/comp01"}));
+    EXPECT_EQ(Paths(table),
+              (std::vector<std::string>{base + "/blank", base + "/short", base + "/comp02",
+                                        base + "/upper", base + "/comp01"}));
     EXPECT_EQ(table[0].name, std::string(20, ' '));
     EXPECT_EQ(ListedName(table[0]), "");
     EXPECT_EQ(table[1].name, "AB" + std::string(18, ' '));

@@ -146,8 +146,8 @@ TEST_F(OpenDirFormTest, AFailedScanIsReportedAndLeavesTheListEmpty) {
         EXPECT_EQ(U(form.Msg1.Caption()), "הסריקה הסתיימה. תקתוק כפול לבחירה...");
     };
     card->Click("CmdDir");
-    EXPECT_THAT(shown(), ::testing::ElementsAre(::testing::AllOf(
-                             ::testing::StartsWith("תקלה: "), ::testing::HasSubstr("gone"))));
+    EXPECT_THAT(shown(), ::testing::ElementsAre(::testing::AllOf(::testing::StartsWith("תקלה: "),
+                                                                 ::testing::HasSubstr("gone"))));
 }
 
 TEST(OpenDirFormLoadTest, ADriveThatIsNotThereLeavesTheFirstAndADriveChangeMovesTheTree) {

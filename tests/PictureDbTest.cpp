@@ -79,7 +79,8 @@ protected:
         db.setBusyTimeout(std::chrono::milliseconds(50));
     }
     // The document lines (item key, category code), pictures looked up.
-    std::vector<std::string> pictures(const std::vector<std::pair<std::string, std::string>>& lines) {
+    std::vector<std::string>
+    pictures(const std::vector<std::pair<std::string, std::string>>& lines) {
         CurrentDocument doc;
         doc.lineCount = static_cast<int16_t>(lines.size());
         for (size_t i = 0; i < lines.size(); ++i) {

@@ -134,8 +134,7 @@ protected:
 
 // Shows a form and runs what the user does while it is open; then the window
 // closes as its close button would.
-template <class F = Form>
-class ScriptedForms : public FormPresenter {
+template <class F = Form> class ScriptedForms : public FormPresenter {
 public:
     void ShowModal(Form& form) override {
         form.Show();
@@ -148,8 +147,7 @@ public:
 };
 
 // What a Card is started with: recorders and fixed values, forms shown to a script.
-template <class F = Form>
-struct CardDesk {
+template <class F = Form> struct CardDesk {
     RecordedMessages messages;
     MemorySettingsStore settings;
     ScriptedForms<F> forms;
