@@ -15,7 +15,13 @@ public:
     explicit ListBox(std::string name) : ComboBox(std::move(name), ControlKind::ListBox) {}
 
     bool Enabled() const { return enabled_; }
-    void setEnabled(bool enabled) { enabled_ = enabled; }
+    // A list switched on or off tells its watchers, as a refill does.
+    void setEnabled(bool enabled) {
+        if (enabled_ == enabled)
+            return;
+        enabled_ = enabled;
+        changed();
+    }
 
 private:
     bool enabled_ = true;
