@@ -1,10 +1,10 @@
 // The printed pages: the Hebrew page with and without amounts, the English
 // page, their shared pieces, and the print button.
 
-#include "pages/Html.h"
 #include "TestCompany.h"
 #include "fixfiles/Formats.h"
 #include "fixfiles/TextDecoding.h"
+#include "pages/Html.h"
 #include "pages/PageFile.h"
 #include "pictures/ItemPicsForm.h"
 #include "platform/Error.h"
@@ -23,12 +23,12 @@
 namespace dovrel {
 namespace {
 
+using nlohmann::json;
 using test::Doc;
 using test::Line;
 using test::ReadAll;
 using test::U;
 using test::W;
-using nlohmann::json;
 namespace fs = std::filesystem;
 
 std::vector<std::string> PageLines(const std::string& page) {
@@ -51,7 +51,8 @@ bool Has(const std::vector<std::string>& lines, const std::string& line) {
 }
 
 // The lines of a page that start with a prefix, in order.
-std::vector<std::string> Starting(const std::vector<std::string>& lines, const std::string& prefix) {
+std::vector<std::string> Starting(const std::vector<std::string>& lines,
+                                  const std::string& prefix) {
     std::vector<std::string> found;
     for (const std::string& line : lines)
         if (line.rfind(prefix, 0) == 0)
@@ -60,7 +61,8 @@ std::vector<std::string> Starting(const std::vector<std::string>& lines, const s
 }
 
 TEST(PagePieces, AsIsCellsCellsRulesAndNumbers) {
-    const std::string open = "<table cellspacing='0' cellpadding='0' border='0' align='right' dir='rtl'><tr>";
+    const std::string open =
+        "<table cellspacing='0' cellpadding='0' border='0' align='right' dir='rtl'><tr>";
     EXPECT_EQ(AsIsTable(""), open + "</tr></table>");
     EXPECT_EQ(AsIsTable("a c"), open + "<td>c</td><td>&nbsp;</td><td>a</td></tr></table>");
     EXPECT_EQ(AsIsTable("<&"), open + "<td>&amp;</td><td>&lt;</td></tr></table>");
@@ -104,13 +106,12 @@ protected:
     ItemPicsForm& pics() { return dynamic_cast<ItemPicsForm&>(*state.Forms.at("frmItemPics")); }
 
     void show(const json& documents, int16_t type = 20) {
-        company = std::make_unique<test::TestCompany>(
-            json{{"company", {{"name", "Demo"}, {"currencies", {"Euro", "Pound"}}}},
-                 {"items",
-                  {{{"key", "A100"}, {"name", W("x")}, {"category", "01"}, {"foreignName", "Widget"}},
-                   {{"key", "B200"}, {"name", W("y")}, {"category", "02"}, {"foreignName", ""}}}},
-                 {"documents", documents}}
-                .dump());
+        company = std::make_unique<test::TestCompany>(json{
+            {"company", {{"name", "Demo"}, {"currencies", {"Euro", "Pound"}}}},
+            {"items",
+             {{{"key", "A100"}, {"name", W("x")}, {"category", "01"}, {"foreignName", "Widget"}},
+              {{"key", "B200"}, {"name", W("y")}, {"category", "02"}, {"foreignName", ""}}}},
+            {"documents", documents}}.dump());
         int32_t start = 2;
         ASSERT_EQ(card->ShowDoc(company->compPath(), type, start), 0);
         ASSERT_TRUE(messages.shown().empty()) << U(messages.shown().front().text);
@@ -140,7 +141,8 @@ protected:
 };
 
 json Delivery() {
-    json lines = {Line("A100", "מסמר", 10, 2), Line("B200", "בורג", 2.5, 4), Line("A100", "שוב", 1, 1)};
+    json lines = {Line("A100", "מסמר", 10, 2), Line("B200", "בורג", 2.5, 4),
+                  Line("A100", "שוב", 1, 1)};
     lines[0]["discount"] = 12.5;
     lines[0]["details"] = "D1";
     lines[1]["currency"] = 10;
@@ -162,7 +164,8 @@ TEST_F(PagesTest, HebrewPricedPageHasItsHeadHeadingLinesAndTotals) {
 
     EXPECT_EQ(page.front(), "<HTML>");
     EXPECT_EQ(page.back(), "</HTML>");
-    EXPECT_TRUE(Has(page, "<meta http-equiv='Content-Type' content='text/html; charset=windows-1255'>"));
+    EXPECT_TRUE(
+        Has(page, "<meta http-equiv='Content-Type' content='text/html; charset=windows-1255'>"));
     EXPECT_TRUE(Has(page, "<td align='left'><img src='logo &#39;a&#39;.png'></td>"));
     EXPECT_TRUE(Has(page, W("<td align='left' class=TD1><b>חברת הדגמה</b></td>")));
     EXPECT_TRUE(Has(page, "<Font class=TD1>06/12/2026</Font>"));
@@ -173,8 +176,10 @@ TEST_F(PagesTest, HebrewPricedPageHasItsHeadHeadingLinesAndTotals) {
                               AsIsTable(state.Doc.header.customerVisual) + "</TD>"));
 
     std::vector<std::string> heads = Starting(page, "    <td");
-    std::vector<std::string> expected = {"    <td width='40' align='right' class=TD5>" + W("שרטוט") + "</td>"};
-    for (const char* caption : {"סהכ שח", "%הנחה", "מטבע", "מחיר", "כמות", "פרטים", "תאור", "פריט", "שורה"})
+    std::vector<std::string> expected = {"    <td width='40' align='right' class=TD5>" +
+                                         W("שרטוט") + "</td>"};
+    for (const char* caption :
+         {"סהכ שח", "%הנחה", "מטבע", "מחיר", "כמות", "פרטים", "תאור", "פריט", "שורה"})
         expected.push_back(W(std::string("    <td align='right' class=TD5>") + caption + "</td>"));
     EXPECT_EQ(heads, expected);
 
@@ -250,7 +255,8 @@ TEST_F(PagesTest, EnglishPageComputesItsTotalsAndTakesForeignNames) {
     const DocTypeRow& type = state.DocTypes[static_cast<size_t>(card->cmbDocType.ListIndex())];
     EXPECT_TRUE(Has(page, "<Font class=TD4>" + type.englishTitle + "&nbsp;1234</Font>"));
     EXPECT_TRUE(Has(page, "<Font class=TD3>Date Produced:&nbsp;03/15/2024</Font>"));
-    EXPECT_TRUE(Has(page, "<TD colspan='3' align='left' class=TD1>" + card->txtCustomerName.Text() + "</TD>"));
+    EXPECT_TRUE(Has(page, "<TD colspan='3' align='left' class=TD1>" + card->txtCustomerName.Text() +
+                              "</TD>"));
     EXPECT_TRUE(Has(page, "    <td align='left' class=TD5>&nbsp;</td>"));
 
     // 2 x 10 less 12.5% = 17.50; 4 x 2.5 = 10.00; 1 x 1 = 1.00; quantity 0 shows nothing.
@@ -260,10 +266,13 @@ TEST_F(PagesTest, EnglishPageComputesItsTotalsAndTakesForeignNames) {
     EXPECT_EQ(Count(page, "<td valign='top' align='right'>&nbsp;</td>"), 1u);
     EXPECT_EQ(Count(page, "<td valign='top' align='left'>Widget</td>"), 2u);
     // B200 has no foreign name: the grid's description stays.
-    EXPECT_TRUE(Has(page, "<td valign='top' align='left'>" + card->DocLines.TextMatrix(2, 2) + "</td>"));
+    EXPECT_TRUE(
+        Has(page, "<td valign='top' align='left'>" + card->DocLines.TextMatrix(2, 2) + "</td>"));
     // The coin column prints the currency's code, never the grid's Hebrew
     // abbreviation; the company's own currencies come from adf.fix.
-    EXPECT_EQ(Count(page, "<td valign='top' align='left'>" + CurrencyNames(21, state.Company).second + "</td>"), 3u);
+    EXPECT_EQ(Count(page, "<td valign='top' align='left'>" +
+                              CurrencyNames(21, state.Company).second + "</td>"),
+              3u);
     EXPECT_NE(CurrencyNames(21, state.Company).second, card->DocLines.TextMatrix(1, 6));
     std::string euro = CurrencyNames(10, state.Company).second;
     EXPECT_NE(euro, "10");
@@ -271,8 +280,9 @@ TEST_F(PagesTest, EnglishPageComputesItsTotalsAndTakesForeignNames) {
 
     // A discount of 0.5 counts as none; VAT is always " 0 ".
     auto total = [&page](const char* label, const std::string& value) {
-        auto it = std::find(page.begin(), page.end(),
-                            std::string("<TD bgcolor='black' align='left' class=TD5>") + label + "</TD>");
+        auto it =
+            std::find(page.begin(), page.end(),
+                      std::string("<TD bgcolor='black' align='left' class=TD5>") + label + "</TD>");
         return it != page.end() && *(it + 1) == "<TD align='right' class=TD1>" + value + "</TD>";
     };
     EXPECT_TRUE(total("Total before Discount:", "28.50"));
@@ -280,7 +290,8 @@ TEST_F(PagesTest, EnglishPageComputesItsTotalsAndTakesForeignNames) {
     EXPECT_TRUE(total("Total:", "28.50"));
     EXPECT_TRUE(total("Vat:", " 0 "));
     EXPECT_TRUE(total("Final Total:", "28.50"));
-    EXPECT_TRUE(Has(page, "<TD align='left' class=TD1>" + state.Doc.header.remarksLogical[2] + "</TD>"));
+    EXPECT_TRUE(
+        Has(page, "<TD align='left' class=TD1>" + state.Doc.header.remarksLogical[2] + "</TD>"));
 
     state.Doc.header.discountPercent = -2;
     page = english(true);
@@ -294,7 +305,8 @@ TEST_F(PagesTest, ExportDocumentsKeepTheGridDescriptionAndNoTitleIsAnError) {
     std::string compDir = company->compPath();
     card->ReadITM(compDir);
     std::vector<std::string> page = english(true);
-    EXPECT_TRUE(Has(page, "<td valign='top' align='left'>" + card->DocLines.TextMatrix(1, 2) + "</td>"));
+    EXPECT_TRUE(
+        Has(page, "<td valign='top' align='left'>" + card->DocLines.TextMatrix(1, 2) + "</td>"));
     EXPECT_FALSE(Has(page, "<td valign='top' align='left'>Widget</td>"));
 
     std::string path = temp.str() + "/page.htm";
@@ -354,7 +366,8 @@ TEST_F(PagesTest, PrintWritesThePrivatePageAndOpensItOrSaysWhatFailed) {
     card->Click("PrintButt");
     EXPECT_EQ(ReadAll(victim), "keep");
     EXPECT_FALSE(fs::is_symlink(page));
-    EXPECT_TRUE(Has(PageLines(ReadAll(page)), "<Font class=TD4>1234&nbsp;" + card->cmbDocType.Text() + "</Font>"));
+    EXPECT_TRUE(Has(PageLines(ReadAll(page)),
+                    "<Font class=TD4>1234&nbsp;" + card->cmbDocType.Text() + "</Font>"));
     ASSERT_EQ(browser.opened, std::vector<std::string>{page.string()});
     struct stat st {};
     ASSERT_EQ(stat(dir.c_str(), &st), 0);

@@ -31,11 +31,11 @@ protected:
 TEST_F(PrintCommandTest, OnePageWithTheSavedLanguageOrTheOneGiven) {
     test::TestCompany company(nlohmann::json{
         {"documents",
-         {Doc(20, "100", "A", {Line("A1", "x")}), Doc(21, "200", "B"), Doc(20, "101", "C")}}}
-                                  .dump());
+         {Doc(20, "100", "A", {Line("A1", "x")}), Doc(21, "200", "B"),
+          Doc(20, "101", "C")}}}.dump());
     std::string page = (temp.path() / "page.htm").string();
-    auto result = RunCli({"print", company.path().string(), "--out", page, "--no-open",
-                          "--today", "2026-02-03", "--start", "3"});
+    auto result = RunCli({"print", company.path().string(), "--out", page, "--no-open", "--today",
+                          "2026-02-03", "--start", "3"});
     ASSERT_EQ(result.code, 0) << result.err;
     EXPECT_EQ(result.out, page + "\n");
     std::string text = ReadAll(page);
@@ -48,8 +48,9 @@ TEST_F(PrintCommandTest, OnePageWithTheSavedLanguageOrTheOneGiven) {
     ASSERT_EQ(RunCli({"settings", "set", "DocLang", "2"}).code, 0);
     ASSERT_EQ(RunCli({"print", company.path().string(), "--out", page, "--no-open"}).code, 0);
     EXPECT_NE(ReadAll(page).find("name='Sel1'"), std::string::npos);
-    ASSERT_EQ(RunCli({"print", company.path().string(), "--out", page, "--no-open", "--lang",
-                      "0"}).code, 0);
+    ASSERT_EQ(
+        RunCli({"print", company.path().string(), "--out", page, "--no-open", "--lang", "0"}).code,
+        0);
     EXPECT_EQ(ReadAll(page).find("name='Sel1'"), std::string::npos);
 }
 
@@ -57,8 +58,7 @@ TEST_F(PrintCommandTest, SeveralPagesGoIntoAFolderNamedByReference) {
     test::TestCompany company(nlohmann::json{
         {"documents",
          {Doc(20, "7/1", "A"), Doc(20, "7/1", "B"), Doc(20, "", "C"), Doc(21, "9", "D"),
-          Doc(20, "8", "E")}}}
-                                  .dump());
+          Doc(20, "8", "E")}}}.dump());
     fs::path folder = temp.path() / "pages";
     fs::create_directory(folder);
     auto result = RunCli({"print", company.path().string(), "--count", "10", "--out",

@@ -17,11 +17,13 @@ void AddPrint(CLI::App& app, Runner& run) {
         ->check(CLI::Range(0, static_cast<int>(std::numeric_limits<int16_t>::max())));
     print->add_option("--start", options->start, "First record to look at (default 2)")
         ->check(CLI::Range(1, std::numeric_limits<int32_t>::max()));
-    print->add_option("--count", options->count,
-                      "Documents to print from the first one found (default 1)")
+    print
+        ->add_option("--count", options->count,
+                     "Documents to print from the first one found (default 1)")
         ->check(CLI::Range(1, std::numeric_limits<int32_t>::max()));
-    print->add_option("--lang", options->lang,
-                      "0 Hebrew, 1 English, 2 Hebrew without amounts (default: as saved)")
+    print
+        ->add_option("--lang", options->lang,
+                     "0 Hebrew, 1 English, 2 Hebrew without amounts (default: as saved)")
         ->check(CLI::Range(0, 2));
     print->add_option("--out", options->out,
                       "The page file (one document) or an existing folder (several)");

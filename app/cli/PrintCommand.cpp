@@ -46,8 +46,8 @@ CivilDate PrintCommand::ParseDay(const std::string& text) {
     int year = 0, month = 0, day = 0;
     char tail = 0;
     if (text.size() != 10 ||
-        std::sscanf(text.c_str(), "%4d-%2d-%2d%c", &year, &month, &day, &tail) != 3 ||
-        month < 1 || month > 12 || day < 1 || day > 31 || year < 100)
+        std::sscanf(text.c_str(), "%4d-%2d-%2d%c", &year, &month, &day, &tail) != 3 || month < 1 ||
+        month > 12 || day < 1 || day > 31 || year < 100)
         throw Error("Not a date (YYYY-MM-DD): " + text);
     return {year, month, day};
 }

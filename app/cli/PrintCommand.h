@@ -13,13 +13,13 @@
 namespace dovrel {
 
 struct PrintOptions {
-    std::string compDir;           // UTF-8, as typed
-    int16_t type = 20;             // document type code
-    int32_t start = 2;             // first record to look at
-    int32_t count = 1;             // documents to print, from the first found on
-    std::optional<int32_t> lang;   // 0 Hebrew, 1 English, 2 Hebrew without amounts
-    std::string out;               // a page file, or a folder for several pages
-    bool open = true;              // open a single page in the browser
+    std::string compDir;         // UTF-8, as typed
+    int16_t type = 20;           // document type code
+    int32_t start = 2;           // first record to look at
+    int32_t count = 1;           // documents to print, from the first found on
+    std::optional<int32_t> lang; // 0 Hebrew, 1 English, 2 Hebrew without amounts
+    std::string out;             // a page file, or a folder for several pages
+    bool open = true;            // open a single page in the browser
     std::optional<CivilDate> today;
 };
 
