@@ -90,7 +90,8 @@ std::optional<std::string> HostSession::handle(std::string_view line) {
     }
     if (!reply.contains("state"))
         reply["messages"] = StateJson::Messages(messages_.take());
-    // The pages the call opened in the browser, which the host opens or reads.
+    // The pages the call opened in the browser, which the host opens or
+    // reads; a call that failed after opening one tells it too.
     if (!browser_.opened.empty()) {
         reply["opened"] = json::array();
         for (const std::string& path : browser_.opened)
@@ -116,13 +117,6 @@ json HostSession::answer(const json& request) {
     json reply = run(request);
     reply["ok"] = true;
     reply["messages"] = StateJson::Messages(messages_.take());
-    // The pages the call opened in the browser, which the host opens or reads.
-    if (!browser_.opened.empty()) {
-        reply["opened"] = json::array();
-        for (const std::string& path : browser_.opened)
-            reply["opened"].push_back(StateJson::Text(path));
-        browser_.opened.clear();
-    }
     reply["state"] = StateJson::Build(card());
     return reply;
 }
