@@ -8,6 +8,8 @@
 #include <gtest/gtest.h>
 
 #include <sstream>
+#include <tuple>
+#include <utility>
 
 namespace dovrel {
 namespace {
@@ -48,7 +50,7 @@ size_t ColumnOf(const std::string& text, const std::string& word) {
     return std::string::npos;
 }
 
-TEST(ShowCommandTest, PrintsTheFirstDocumentOfTheTypeFromTheStartRecord) {
+TEST(ShowCommandTest, PrintsTheFirstDocumentOfTheTypeFromTheStartRecordOrItsState) {
     test::TestCompany company(kCompany);
     std::string path = company.path().string();
     Output shown = Show({path, 20, 2, false});
@@ -59,10 +61,9 @@ TEST(ShowCommandTest, PrintsTheFirstDocumentOfTheTypeFromTheStartRecord) {
         EXPECT_THAT(shown.out, HasSubstr(part));
     EXPECT_THAT(shown.out, Not(HasSubstr("דנה לוי")));
     // Columns line up on the screen although Hebrew letters take two bytes each.
-    EXPECT_EQ(ColumnOf(shown.out, "A100"), ColumnOf(shown.out, "פריט"));
-    EXPECT_EQ(ColumnOf(shown.out, "מקלדת"), ColumnOf(shown.out, "תאור"));
-    EXPECT_EQ(ColumnOf(shown.out, "10.50"), ColumnOf(shown.out, "מחיר"));
-    EXPECT_EQ(ColumnOf(shown.out, "יורו"), ColumnOf(shown.out, "מטבע"));
+    for (auto [cell, heading] :
+         {std::pair{"A100", "פריט"}, {"מקלדת", "תאור"}, {"10.50", "מחיר"}, {"יורו", "מטבע"}})
+        EXPECT_EQ(ColumnOf(shown.out, cell), ColumnOf(shown.out, heading)) << cell;
     EXPECT_THAT(shown.out, ContainsRegex("\nסה\"כ: +213.78\nמע\"מ: +36.34\n"
                                          "סה\"כ כולל מע\"מ: +250.12\n"));
     // The first delivery note takes records 2 to 5; from 4 on the next one shows.
@@ -75,30 +76,26 @@ TEST(ShowCommandTest, PrintsTheFirstDocumentOfTheTypeFromTheStartRecord) {
     Output unknown = Show({path, 8, 2, false});
     EXPECT_THAT(unknown.err, HasSubstr("no document type 8"));
     EXPECT_EQ(unknown.out, "לא נמצא מסמך\n");
+
+    // As JSON the output is the state the host answers with.
+    json state = json::parse(Show({path, 20, 2, true}).out);
+    ModuleState shared;
+    HostSession session(shared);
+    session.handle(json({"ReadAdf", path}).dump());
+    json host = json::parse(*session.handle(json({"call", "ShowDoc", path, 20, 2}).dump()));
+    EXPECT_EQ(json({state["CompDir"], state["controls"]["txtCustomerName"]}),
+              json({path, "משה כהן"}));
+    EXPECT_EQ(state, host["state"]);
 }
 
 TEST(ShowCommandTest, MissingFilesAndDirectories) {
     test::TestCompany company(R"({"company": {"title": "ריקה"}})");
     std::string path = company.path().string();
     Output shown = Show({path, 20, 2, false});
-    EXPECT_EQ(shown.code, 1);
-    EXPECT_EQ(shown.out, "");
-    EXPECT_EQ(shown.err, "dovrel: שגיאה: קבצי מסמכים לא נמצאו\n");
+    EXPECT_EQ(std::tie(shown.code, shown.out, shown.err),
+              std::make_tuple(1, "", "dovrel: שגיאה: קבצי מסמכים לא נמצאו\n"));
     EXPECT_THROW(Show({path + "/no-such-company", 20, 2, false}), Error);
     EXPECT_THROW(Show({path, 20, 0, false}), Error);
-}
-
-TEST(ShowCommandTest, JsonIsTheHostsState) {
-    test::TestCompany company(kCompany);
-    std::string path = company.path().string();
-    json state = json::parse(Show({path, 20, 2, true}).out);
-    EXPECT_EQ(state["controls"]["txtCustomerName"], "משה כהן");
-    ModuleState shared;
-    HostSession session(shared);
-    session.handle(json({"ReadAdf", path}).dump());
-    json host = json::parse(*session.handle(json({"call", "ShowDoc", path, 20, 2}).dump()));
-    EXPECT_EQ(state["CompDir"], path);
-    EXPECT_EQ(state, host["state"]);
 }
 
 } // namespace
