@@ -25,11 +25,11 @@ TEST(GridTest, FormatStringMakesColumnsHeadingsAlignmentsAndWidths) {
     grid.setFormatString(W("<שורה|<פריט    ") + "|^Mid|>Right  |Plain||<");
     ASSERT_EQ(grid.Cols(), 7);
     EXPECT_EQ(AllRows(grid), (Texts{W("שורה|פריט    |Mid|Right  |Plain||")}));
-    const int32_t alignments[] = {1, 1, 4, 7, 9, 9, 1}, widths[] = {4, 8, 3, 7, 5, 0, 0};
-    for (int32_t col = 0; col < 7; ++col) {
-        EXPECT_EQ(grid.ColAlignment(col), alignments[col]) << col;
-        EXPECT_EQ(grid.ColWidthChars(col), widths[col]) << col;
-    }
+    std::vector<std::pair<int32_t, int32_t>> columns;
+    for (int32_t col = 0; col < 7; ++col)
+        columns.emplace_back(grid.ColAlignment(col), grid.ColWidthChars(col));
+    EXPECT_EQ(columns, (std::vector<std::pair<int32_t, int32_t>>{
+                           {1, 4}, {1, 8}, {4, 3}, {7, 7}, {9, 5}, {9, 0}, {1, 0}}));
 }
 
 TEST(GridTest, RowsGrowWithEmptyRowsAndShrinkFromTheEnd) {
@@ -54,9 +54,8 @@ TEST(GridTest, RowsGrowWithEmptyRowsAndShrinkFromTheEnd) {
 TEST(GridTest, AddItemSplitsAtTabsAndInsertsAtAnIndex) {
     Grid grid("g");
     grid.setFormatString("a|b|c");
-    grid.AddItem("1\t2\t3\t4\t5");
-    grid.AddItem("x");
-    grid.AddItem("\tmiddle\t");
+    for (const char* item : {"1\t2\t3\t4\t5", "x", "\tmiddle\t"})
+        grid.AddItem(item);
     grid.AddItem("first", 1);
     grid.AddItem("last", grid.Rows());
     grid.AddItem("top", 0);
@@ -90,14 +89,12 @@ TEST(GridTest, TooManyCellsAreAnErrorThatChangesNothing) {
     ASSERT_EQ(wide.Cols(), 100);
     EXPECT_THROW(wide.setRows(100000), Error);
     EXPECT_THROW(wide.setFixedRows(100000), Error);
-    EXPECT_EQ(wide.Rows(), 1);
-    EXPECT_EQ(wide.FixedRows(), 0);
+    EXPECT_EQ(std::pair(wide.Rows(), wide.FixedRows()), std::pair(1, 0));
 
     Grid tall("tall");
     tall.setRows(1000000);
     EXPECT_THROW(tall.setFormatString("1|2|3|4|5|6|7|8|9"), Error);
-    EXPECT_EQ(tall.Cols(), 0);
-    EXPECT_EQ(tall.FormatString(), "");
+    EXPECT_EQ(std::pair(tall.Cols(), tall.FormatString()), std::pair(0, std::string()));
     tall.setRows(10);
     tall.setFormatString("1|2|3|4|5|6|7|8|9");
     EXPECT_EQ(tall.TextMatrix(0, 8), "9");
@@ -113,13 +110,13 @@ TEST(GridTest, CurrentRowAndHeadingRows) {
     grid.AddItem("c\td");
     grid.setRow(2);
     EXPECT_EQ(grid.Row(), 2);
-    EXPECT_THROW(grid.setRow(3), Error);
-    EXPECT_THROW(grid.setRow(-2), Error);
+    for (int32_t row : {3, -2})
+        EXPECT_THROW(grid.setRow(row), Error) << row;
     // Removing the current row moves it to the last one left, or to none.
-    grid.setRows(2);
-    EXPECT_EQ(grid.Row(), 1);
-    grid.setRows(1);
-    EXPECT_EQ(grid.Row(), -1);
+    for (auto [rows, current] : {std::pair{2, 1}, {1, -1}}) {
+        grid.setRows(rows);
+        EXPECT_EQ(grid.Row(), current) << rows;
+    }
     // More heading rows than rows add rows; fewer rows hold the heading rows to them.
     grid.setFixedRows(3);
     EXPECT_EQ(grid.Rows(), 3);
