@@ -1,6 +1,5 @@
 #include "QtHost.h"
 
-#include <QPixmap>
 #include <QTableView>
 
 namespace dovrel::test {
@@ -15,15 +14,11 @@ TEST_F(DemoTest, TheFirstDeliveryNoteOfTheDemoCompanyIsShownInHebrew) {
     ASSERT_TRUE(object->lastError().isEmpty()) << object->lastError().toStdString();
     EXPECT_EQ(result, 0);
     EXPECT_TRUE(boxes.empty());
-    auto* customer = find<QLineEdit>("txtCustomerName");
-    EXPECT_EQ(customer->text().trimmed(), Q("כהן שיפוצים ובניה"));
+    EXPECT_EQ(find<QLineEdit>("txtCustomerName")->text().trimmed(), Q("כהן שיפוצים ובניה"));
     EXPECT_EQ(find<QLineEdit>("txtReference1")->text().trimmed(), "4101");
     EXPECT_GT(find<QTableView>("DocLines")->model()->rowCount(), 1);
-
-    QPixmap shot = widget->grab();
-    EXPECT_EQ(shot.size(), widget->size() * shot.devicePixelRatio());
     QString file = QString::fromUtf8(DOVREL_QT_OUTPUT_DIR) + "/dovrel-viewer-demo.png";
-    EXPECT_TRUE(shot.save(file, "PNG")) << file.toStdString();
+    EXPECT_TRUE(widget->grab().save(file, "PNG")) << file.toStdString();
 }
 
 } // namespace
