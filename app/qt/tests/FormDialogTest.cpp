@@ -47,12 +47,11 @@ protected:
 };
 
 TEST_F(FormDialogTest, AccountDetailsCopyTheSelectionOrTheWholeBox) {
-    TestCompany company(json{{"accounts",
-                              {{{"key", "1001"},
-                                {"phone", "03-1234567 054-7654321"},
-                                {"district", "מרכז"},
-                                {"details", "לקוח ותיק"}}}}}
-                            .dump());
+    json account = {{"key", "1001"},
+                    {"phone", "03-1234567 054-7654321"},
+                    {"district", "מרכז"},
+                    {"details", "לקוח ותיק"}};
+    TestCompany company(json{{"accounts", {account}}}.dump());
     card().txtCompPath.setText(company.compPath());
     retype(find<QLineEdit>("txtAccountKey"), "1001");
     open("cmdAccount", [&](FormDialog& dialog) {
@@ -97,14 +96,12 @@ TEST_F(FormDialogTest, TheCompanyChooserScansTheChosenDirectoryAndReturnsTheComp
 
         auto* tree = in<QTreeView>(dialog, "MainDir");
         auto* files = qobject_cast<QFileSystemModel*>(tree->model());
-        ASSERT_NE(files, nullptr);
         tree->setCurrentIndex(files->index(QString::fromStdString(main.str())));
         EXPECT_EQ(static_cast<OpenDirForm&>(dialog.form()).MainDir.Path(), W(main.str()));
         press(dialog, "cmdFindWizComp");
         auto* list = in<QListWidget>(dialog, "cmbCompany");
         ASSERT_EQ(list->count(), 2);
-        EXPECT_EQ(list->item(0)->text(), Q("אלף"));
-        EXPECT_EQ(list->item(1)->text(), Q("גמל"));
+        EXPECT_EQ(list->item(0)->text() + "," + list->item(1)->text(), Q("אלף,גמל"));
         EXPECT_EQ(in<QLabel>(dialog, "Msg1")->text(), Q("הסריקה הסתיימה. תקתוק כפול לבחירה..."));
         list->setCurrentRow(1);
         press(dialog, "OKButton");
@@ -164,8 +161,7 @@ TEST_F(FormDialogTest, ThePictureSettingsFormEditsItsRangesInTheGrid) {
         ASSERT_EQ(boxes.size(), 3u);
         EXPECT_EQ(boxes[1].text, Q("האם אתה בטוח?"));
         EXPECT_EQ(boxes[1].buttons, QMessageBox::Yes | QMessageBox::No);
-        EXPECT_EQ(boxes[2].title, Q("הודעה"));
-        EXPECT_EQ(boxes[2].text, Q("בסיס הנתונים אותחל"));
+        EXPECT_EQ(boxes[2].title + "|" + boxes[2].text, Q("הודעה|בסיס הנתונים אותחל"));
         EXPECT_EQ(boxes[2].icon, QMessageBox::Information);
 
         press(dialog, "CmdNew");
