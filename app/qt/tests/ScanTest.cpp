@@ -52,8 +52,6 @@ TEST_F(ScanTest, TheProgressBarRepaintsAtMostThirtyTimesASecond) {
         << paints << " repaints in " << elapsed << " ms";
     EXPECT_LT(paints, moves);
     EXPECT_EQ(card().ProgressFill.Width(), 0);
-    std::cout << "scan of " << kFillers << " records: " << elapsed << " ms, " << moves
-              << " moves of the fill, " << paints << " repaints\n";
 }
 
 TEST_F(ScanTest, InputDuringAScanWaitsUntilItEnds) {
