@@ -39,16 +39,12 @@ TEST(SampleRecordsTest, DocumentRecordsMatchTheDescriptionWriter) {
                    "rate": 3.7}]})json");
     sample::DocumentData data;
     data.type = 5;
-    data.account = StoredText("1001", 8);
+    data.account = StoredText("1001", 8), data.reference = StoredText("4711", 5);
     data.customer = StoredText("משה כהן (בע\"מ)", 30);
-    data.address1 = StoredText("רח' הרצל 45", 30);
-    data.address2 = StoredText("תל אביב", 30);
-    data.reference = StoredText("4711", 5);
+    data.address1 = StoredText("רח' הרצל 45", 30), data.address2 = StoredText("תל אביב", 30);
     data.remarks = {StoredText("הערה ראשונה", 48), "", StoredText("Remark 3", 48)};
     data.year = 2019, data.month = 2, data.day = 28;
-    data.discountPercent = 7.5;
-    data.vatPercent = 18;
-    data.warehouse = 3;
+    data.discountPercent = 7.5, data.vatPercent = 18, data.warehouse = 3;
     data.lines = {
         {StoredText("A100", 12), StoredText("מברג חשמלי", 40), "X1", 21, 1234.5, 2, 12.5, 1},
         {"*", StoredText("שורת טקסט", 40), "", 21, 0, 0, 0, 1},
@@ -65,10 +61,10 @@ TEST(SampleRecordsTest, ItemAccountAndFillerRecordsMatchTheDescriptionWriter) {
         R"({"key": "מק-7", "name": "מקלדת", "category": "07", "foreignName": "Keyboard"})");
     json account = json::parse(R"({"key": "1001", "name": "דוד לוי", "phone": "03-1234567",
                                    "district": "מרכז", "details": "לקוח ותיק"})");
-    std::string items = Described({{"items", {item}}}, "ITM.fix", 500);
-    std::string accounts = Described({{"accounts", {account}}}, "ACT.fix", 650);
-    EXPECT_EQ(items, sample::ItemRecordOf(item) + sample::FillerRecordOf(500, false));
-    EXPECT_EQ(accounts, sample::AccountRecordOf(account) + sample::FillerRecordOf(650, false));
+    EXPECT_EQ(Described({{"items", {item}}}, "ITM.fix", 500),
+              sample::ItemRecordOf(item) + sample::FillerRecordOf(500, false));
+    EXPECT_EQ(Described({{"accounts", {account}}}, "ACT.fix", 650),
+              sample::AccountRecordOf(account) + sample::FillerRecordOf(650, false));
 
     test::TempDir dir;
     sample::WriteCompany(json{{"documents", json::array()}}, dir.path());
@@ -76,10 +72,9 @@ TEST(SampleRecordsTest, ItemAccountAndFillerRecordsMatchTheDescriptionWriter) {
 }
 
 TEST(SampleRecordsTest, FilesByTypeAndBadValues) {
-    EXPECT_EQ(sample::DocumentFileOf(20), "ISHP.FIX");
-    EXPECT_EQ(sample::DocumentFileOf(36), "IORDR.FIX");
-    EXPECT_EQ(sample::DocumentFileOf(41), "IBD.FIX");
-    EXPECT_EQ(sample::DocumentFileOf(19), "IMV.FIX");
+    for (const auto& [type, file] :
+         {std::pair{20, "ISHP.FIX"}, {36, "IORDR.FIX"}, {41, "IBD.FIX"}, {19, "IMV.FIX"}})
+        EXPECT_EQ(sample::DocumentFileOf(type), file);
 
     sample::DocumentData badDate, badType, badDiscount, tooManyLines;
     badDate.month = 2, badDate.day = 30;
