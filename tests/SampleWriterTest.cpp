@@ -12,6 +12,7 @@
 #include <map>
 #include <set>
 #include <string>
+#include <tuple>
 
 namespace dovrel {
 namespace {
@@ -86,21 +87,19 @@ TEST(SampleWriter, DocumentRecordsHoldTheirFieldsAtTheirOffsets) {
     std::string more = data.substr(340, 170);
     EXPECT_EQ(more.substr(0, 1) + more.substr(5, 96) + more.substr(102, 3),
               B({2}) + Spaces(47) + B({0x81}) + Spaces(47) + B({0x82, 124, 3, 15}));
-    EXPECT_EQ(DoubleAt(more, 112), 10.0);
-    EXPECT_EQ(DoubleAt(more, 128), 17.0);
-    EXPECT_EQ(ByteAt(more, 138), 2);
     // Hidden lines and lines of another document type are not in the totals.
-    EXPECT_EQ(DoubleAt(more, 154), 18.375);
+    EXPECT_EQ(std::tuple(DoubleAt(more, 112), DoubleAt(more, 128), DoubleAt(more, 154)),
+              std::tuple(10, 17, 18.375));
+    EXPECT_EQ(ByteAt(more, 138), 2);
     EXPECT_DOUBLE_EQ(DoubleAt(more, 120), 19.348875);
     std::string line = data.substr(510, 170);
     EXPECT_EQ(line.substr(0, 53), B({3}) + "A100" + Spaces(8) + "Widget" + Spaces(34));
     EXPECT_EQ(line.substr(64, 9), "x       " + B({1}));
-    EXPECT_EQ(ByteAt(line, 93), 21);
-    EXPECT_EQ(DoubleAt(line, 108), 10.5);
-    EXPECT_EQ(DoubleAt(line, 116), 18.375);
-    EXPECT_EQ(DoubleAt(line, 124), 2.0);
-    EXPECT_EQ(line.substr(156, 2), B({0xE2, 0x04})); // 12.5% as 1250
-    EXPECT_EQ(ByteAt(line, 162), 1);
+    EXPECT_EQ(std::tuple(DoubleAt(line, 108), DoubleAt(line, 116), DoubleAt(line, 124)),
+              std::tuple(10.5, 18.375, 2));
+    // Currency, 12.5% as 1250, and the line's document kind.
+    EXPECT_EQ(line.substr(93, 1) + line.substr(156, 2) + line.substr(162, 1),
+              B({21, 0xE2, 0x04, 1}));
 }
 
 TEST(SampleWriter, ItemAccountAndCompanyRecordsHoldTheirFieldsAtTheirOffsets) {
@@ -138,8 +137,8 @@ TEST(SampleWriter, HexVisualLongAndExtremeValuesAreStoredAsAsked) {
                                          B({0x84, 0x83, 0x82, 0x81, 0x80}));
     EXPECT_EQ(data.substr(340 + 102, 3), B({255, 13, 0}));
     // The "#" line is left out of the total; the other is priced at a rate of 3.5.
-    EXPECT_DOUBLE_EQ(DoubleAt(data, 340 + 154), 14.315);
-    EXPECT_DOUBLE_EQ(DoubleAt(data, 680 + 116), 14.315);
+    for (size_t offset : {340 + 154, 680 + 116})
+        EXPECT_DOUBLE_EQ(DoubleAt(data, offset), 14.315) << offset;
     // The first eight characters, "רח' הרצל", stored reversed; the number is cut off.
     EXPECT_EQ(data.substr(680 + 64, 9), B({0x8C, 0x96, 0x98, 0x84, ' ', '\'', 0x87, 0x98, 255}));
     EXPECT_EQ(data.substr(680 + 156, 2), B({0x1F, 0xFF})); // -2.25% as -225
