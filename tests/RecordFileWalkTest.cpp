@@ -1,6 +1,6 @@
 // The block reader under the walks the document reader makes: backward, with
 // looks ahead at each document's later records, over blocks that records
-// straddle.
+// straddle. (A file shortened under it: RecordFileTest.)
 
 #include "fixfiles/RecordFile.h"
 
@@ -30,21 +30,6 @@ TEST(RecordFileWalkTest, BackwardWalksThatLookAheadReadEveryRecordRight) {
         }
         EXPECT_EQ(file.record(301), nullptr);
     }
-}
-
-TEST(RecordFileWalkTest, AShortenedFileHidesRecordsThatAnOlderBlockStillHolds) {
-    test::TempDir dir;
-    std::filesystem::path path = dir.path() / "DATA.FIX";
-    test::WriteNumbered(path, 100, 10);
-    RecordFile file(path.string(), 10, 100);
-    ASSERT_NE(file.record(1), nullptr);  // a block of records 1 to 10
-    ASSERT_NE(file.record(50), nullptr); // and after it, 50 to 59
-    std::filesystem::resize_file(path, 55);
-    EXPECT_EQ(file.record(70), nullptr); // read afresh: the end of the file is met
-    EXPECT_EQ(file.record(8), nullptr);  // so the older block no longer counts
-    ASSERT_NE(file.record(5), nullptr);
-    EXPECT_EQ(file.record(5)[0], 5);
-    EXPECT_EQ(file.record(6), nullptr);
 }
 
 } // namespace
