@@ -32,14 +32,23 @@ TEST(GridTest, FormatStringMakesColumnsHeadingsAlignmentsAndWidths) {
                            {1, 4}, {1, 8}, {4, 3}, {7, 7}, {9, 5}, {9, 0}, {1, 0}}));
 }
 
-TEST(GridTest, RowsGrowWithEmptyRowsAndShrinkFromTheEnd) {
+TEST(GridTest, RowsGrowAndShrinkFromTheEndAndCellsOutsideAreErrors) {
     Grid grid("g");
+    EXPECT_THROW(grid.TextMatrix(0, 0), Error);
     grid.setFormatString("a|b");
     grid.setRows(3);
     grid.setTextMatrix(1, 0, "one");
     grid.setTextMatrix(2, 1, "two");
     grid.setRows(2);
     EXPECT_EQ(AllRows(grid), (Texts{"a|b", "one|"}));
+    for (auto [row, col] : {std::pair{2, 0}, {-1, 0}, {0, 2}, {0, -1}}) {
+        EXPECT_THROW(grid.TextMatrix(row, col), Error) << row << "," << col;
+        EXPECT_THROW(grid.setTextMatrix(row, col, "x"), Error) << row << "," << col;
+    }
+    EXPECT_THROW(grid.ColAlignment(2), Error);
+    EXPECT_THROW(grid.setColAlignment(-1, 7), Error);
+    EXPECT_THROW(grid.setColAlignment(0, 10), Error);
+    EXPECT_THROW(grid.ColWidthChars(2), Error);
     grid.setRows(4);
     EXPECT_EQ(AllRows(grid), (Texts{"a|b", "one|", "|", "|"}));
     // Clear empties the cells; a new format string keeps the rows and rewrites row 0.
@@ -64,21 +73,6 @@ TEST(GridTest, AddItemSplitsAtTabsAndInsertsAtAnIndex) {
     EXPECT_THROW(grid.AddItem("bad", grid.Rows() + 1), Error);
     EXPECT_THROW(grid.AddItem("bad", -1), Error);
     EXPECT_EQ(grid.Rows(), 7);
-}
-
-TEST(GridTest, CellsAndColumnsOutsideTheGridAreErrors) {
-    Grid grid("g");
-    EXPECT_THROW(grid.TextMatrix(0, 0), Error);
-    grid.setFormatString("a|b");
-    grid.setRows(2);
-    for (auto [row, col] : {std::pair{2, 0}, {-1, 0}, {0, 2}, {0, -1}}) {
-        EXPECT_THROW(grid.TextMatrix(row, col), Error) << row << "," << col;
-        EXPECT_THROW(grid.setTextMatrix(row, col, "x"), Error) << row << "," << col;
-    }
-    EXPECT_THROW(grid.ColAlignment(2), Error);
-    EXPECT_THROW(grid.setColAlignment(-1, 7), Error);
-    EXPECT_THROW(grid.setColAlignment(0, 10), Error);
-    EXPECT_THROW(grid.ColWidthChars(2), Error);
 }
 
 // Many columns must not let the row limit alone take gigabytes: the cell
