@@ -44,7 +44,7 @@ protected:
     std::unique_ptr<TestCompany> company;
 };
 
-TEST_F(CardWidgetTest, EveryControlOfTheSurfaceHasAWidgetWhereItIsDesigned) {
+TEST_F(CardWidgetTest, EveryControlHasAWidgetWhereItIsDesignedThatFollowsItsModel) {
     double scale = ControlBinder::Scale(widget.get());
     std::map<ControlKind, const char*> classes = {
         {ControlKind::TextBox, "QLineEdit"},  {ControlKind::ComboBox, "QComboBox"},
@@ -104,6 +104,32 @@ TEST_F(CardWidgetTest, EveryControlOfTheSurfaceHasAWidgetWhereItIsDesigned) {
     EXPECT_EQ(lines->model()->headerData(0, Qt::Horizontal).toString(), Q("שורה"));
     EXPECT_EQ(lines->model()->headerData(7, Qt::Horizontal).toString().trimmed(), Q("סהכ שח"));
     EXPECT_GT(lines->columnWidth(2), lines->columnWidth(0)); // "תאור" has 70 spaces
+
+    // The model's changes reach their widgets.
+    card().txtTitle.setText(W("כותרת חדשה"));
+    EXPECT_EQ(text("txtTitle"), Q("כותרת חדשה"));
+    card().ChkWithDrawing.setValue(1);
+    EXPECT_EQ(find<QCheckBox>("ChkWithDrawing")->checkState(), Qt::Checked);
+    card().chkLineDisc.setValue(2);
+    EXPECT_EQ(find<QCheckBox>("chkLineDisc")->checkState(), Qt::PartiallyChecked);
+    card().cmbRules.setListIndex(2);
+    EXPECT_EQ(find<QComboBox>("cmbRules")->currentIndex(), 2);
+    card().DocLines.AddItem("1\tA", 1);
+    EXPECT_EQ(lines->model()->rowCount(), 2);
+
+    // And the user's changes reach the models.
+    card().ChkShowDetails.setValue(0);
+    QTest::mouseClick(find<QCheckBox>("ChkShowDetails"), Qt::LeftButton);
+    EXPECT_EQ(card().ChkShowDetails.Value(), 1);
+    find<QComboBox>("CmbDocLang")->setCurrentIndex(1);
+    EXPECT_EQ(card().CmbDocLang.ListIndex(), 1);
+
+    // Leaving the language list on English puts the English title into the
+    // title box, replacing what was typed.
+    find<QComboBox>("cmbDocType")->setCurrentIndex(kDeliveryRow);
+    find("CmbDocLang")->setFocus();
+    find("txtTitle")->setFocus();
+    EXPECT_EQ(text("txtTitle"), "Delivery Note");
 }
 
 TEST_F(CardWidgetTest, ClicksRunTheHandlersTheBoxesShowTheDocumentAndPrintOpensIt) {
@@ -153,34 +179,6 @@ TEST_F(CardWidgetTest, ClicksRunTheHandlersTheBoxesShowTheDocumentAndPrintOpensI
     EXPECT_EQ(card().PubSearchBy, "Details");
     EXPECT_EQ(text("txtReference1"), "");
     EXPECT_TRUE(boxes.empty());
-}
-
-TEST_F(CardWidgetTest, ModelChangesReachTheirWidgets) {
-    card().txtTitle.setText(W("כותרת חדשה"));
-    EXPECT_EQ(text("txtTitle"), Q("כותרת חדשה"));
-    card().ChkWithDrawing.setValue(1);
-    EXPECT_EQ(find<QCheckBox>("ChkWithDrawing")->checkState(), Qt::Checked);
-    card().chkLineDisc.setValue(2);
-    EXPECT_EQ(find<QCheckBox>("chkLineDisc")->checkState(), Qt::PartiallyChecked);
-    card().cmbRules.setListIndex(2);
-    EXPECT_EQ(find<QComboBox>("cmbRules")->currentIndex(), 2);
-    card().DocLines.AddItem("1\tA", 1);
-    EXPECT_EQ(find<QTableView>("DocLines")->model()->rowCount(), 2);
-
-    // And the user's changes reach the models.
-    card().ChkShowDetails.setValue(0);
-    QTest::mouseClick(find<QCheckBox>("ChkShowDetails"), Qt::LeftButton);
-    EXPECT_EQ(card().ChkShowDetails.Value(), 1);
-    find<QComboBox>("CmbDocLang")->setCurrentIndex(1);
-    EXPECT_EQ(card().CmbDocLang.ListIndex(), 1);
-
-    // Leaving the language list on English puts the English title into the
-    // title box, replacing what was typed.
-    find<QComboBox>("cmbDocType")->setCurrentIndex(kDeliveryRow);
-    QWidget* lang = find("CmbDocLang");
-    lang->setFocus();
-    find("txtTitle")->setFocus();
-    EXPECT_EQ(text("txtTitle"), ToQString(card().shared().DocTypes[kDeliveryRow].englishTitle));
 }
 
 TEST_F(CardWidgetTest, MessageBoxesCarryTheExactTitleTextIconAndButtons) {
