@@ -2,12 +2,12 @@
 // regular files where a data file should be, huge counts and every byte value
 // in every text field.
 
+#include "RunCli.h"
+#include "TestCompany.h"
 #include "app/cli/ShowCommand.h"
 #include "app/cli/StateJson.h"
 #include "control/Card.h"
 #include "platform/Error.h"
-#include "RunCli.h"
-#include "TestCompany.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -25,49 +25,34 @@ namespace {
 
 namespace fs = std::filesystem;
 using nlohmann::json;
-using ::testing::HasSubstr;
 using test::U;
 using test::W;
+using ::testing::HasSubstr;
 
-constexpr int16_t kDeliveryRow = 13;  // type 20, ISHP.FIX
+constexpr int16_t kDeliveryRow = 13; // type 20, ISHP.FIX
 const char* const kMissing = "קבצי מסמכים לא נמצאו";
 
 json OneDocument(const std::string& reference) {
-    return {{"documents",
-             {{{"type", 20}, {"reference", reference}, {"customer", "משה \"כהן\" & בנו"},
-               {"lines", {{{"key", "A1"}, {"description", "a & b"}, {"price", 1},
-                           {"quantity", 1}}}}}}}};
+    json company = json::parse(R"({"documents": [{"type": 20, "customer": "משה \"כהן\" & בנו",
+                                                  "lines": [{"key": "A1", "price": 1}]}]})");
+    company["documents"][0]["reference"] = reference;
+    return company;
 }
 
 // A command that hangs on a hostile path is killed after 30 seconds (-2).
-test::CliResult RunCli(const std::vector<std::string>& args) {
-    return test::RunCli(args, "", 30);
+test::CliResult Show(const std::string& path, const std::string& option = "") {
+    return option.empty() ? test::RunCli({"show", path}, "", 30)
+                          : test::RunCli({"show", path, option}, "", 30);
 }
 
 class HostileInputTest : public ::testing::Test {
 protected:
     // Reads the first delivery note of the company path (UTF-8).
-    int32_t read(const std::string& compPath, const std::string& direction = "First") {
+    int32_t read(const std::string& compPath, std::string direction = "First") {
         int16_t row = kDeliveryRow;
-        std::string dir = direction;
         std::string fromDate;
-        return card.ReadStock(W(compPath), row, card.PubSearchBy, card.PubSearchValue, dir,
+        return card.ReadStock(W(compPath), row, card.PubSearchBy, card.PubSearchValue, direction,
                               fromDate);
-    }
-    // A refused path: result 0, one message saying no document files were
-    // found, the document shown before kept.
-    ::testing::AssertionResult refused(const std::string& compPath) {
-        messages.take();
-        int32_t result = read(compPath);
-        std::vector<RecordedMessages::Shown> shown = messages.take();
-        if (result != 0 || shown.size() != 1)
-            return ::testing::AssertionFailure() << "result " << result << ", " << shown.size()
-                                                 << " messages";
-        if (U(shown[0].title) != "שגיאה" || U(shown[0].text).find(kMissing) == std::string::npos)
-            return ::testing::AssertionFailure() << U(shown[0].title) << ": " << U(shown[0].text);
-        if (U(card.txtReference1.Text()) != "shown")
-            return ::testing::AssertionFailure() << "the shown document was replaced";
-        return ::testing::AssertionSuccess();
     }
 
     ModuleState state;
@@ -90,7 +75,7 @@ TEST_F(HostileInputTest, CompanyPathsWithSpacesQuotesDotsAndOddLetters) {
             EXPECT_EQ(U(card.txtReference1.Text()), "7") << path;
             EXPECT_TRUE(messages.take().empty()) << path;
         }
-        auto [code, out, err] = RunCli({"show", plain});
+        auto [code, out, err] = Show(plain);
         EXPECT_EQ(code, 0) << err;
         EXPECT_THAT(out, HasSubstr("משה \"כהן\" & בנו"));
     }
@@ -110,40 +95,46 @@ TEST_F(HostileInputTest, ThingsThatAreNotACompanyOrNotARegularFileAreRefused) {
     fs::create_symlink("ISHP.FIX", loop / "ISHP.FIX");
     fs::create_directories(folder / "ISHP.FIX");
 
-    for (const std::string& path : {(good / "ISHP.FIX").string(),  // a file, not a directory
-                                    fifo.string(), device.string(), loop.string(),
-                                    folder.string(), (root.path() / "none").string(),
-                                    std::string(), good.string() + std::string(1, '\0') + "x",
-                                    good.string() + "\x01\x7f\n", std::string(5000, 'x')})
-        EXPECT_TRUE(refused(path)) << path.size() << " " << path;
+    for (const std::string& path : {(good / "ISHP.FIX").string(), // a file, not a directory
+                                    fifo.string(), device.string(), loop.string(), folder.string(),
+                                    (root.path() / "none").string(), std::string(),
+                                    good.string() + std::string(1, '\0') + "x",
+                                    good.string() + "\x01\x7f\n", std::string(5000, 'x')}) {
+        // Refused: result 0, one message that no document files were found, the
+        // document shown before kept.
+        SCOPED_TRACE(std::to_string(path.size()) + " " + path);
+        EXPECT_EQ(read(path), 0);
+        std::vector<RecordedMessages::Shown> shown = messages.take();
+        ASSERT_EQ(shown.size(), 1u);
+        EXPECT_EQ(U(shown[0].title), "שגיאה");
+        EXPECT_THAT(U(shown[0].text), HasSubstr(kMissing));
+        EXPECT_EQ(U(card.txtReference1.Text()), "shown");
+    }
 
     // The readers without a check of their own refuse such files too.
-    for (const auto& [dir, target] : {std::pair{fifo, fifo / "ISHP.FIX"},
-                                      std::pair{device, fs::path("/dev/zero")}}) {
+    for (const auto& [dir, target] :
+         {std::pair{fifo, fifo / "ISHP.FIX"}, std::pair{device, fs::path("/dev/zero")}}) {
         fs::create_symlink(target, dir / "ITM.fix");
         fs::create_symlink(target, dir / "ACT.fix");
         std::string path = W(dir.string());
-        for (auto reader : {&Card::ReadITM, &Card::ReadACT}) {
-            try {
-                (card.*reader)(path);
-                ADD_FAILURE() << dir << " was read";
-            } catch (const Error& e) {
-                EXPECT_THAT(e.what(), HasSubstr("not a regular file")) << dir;
-            }
-        }
+        for (auto reader : {&Card::ReadITM, &Card::ReadACT})
+            EXPECT_THAT([&] { (card.*reader)(path); },
+                        ::testing::ThrowsMessage<Error>(HasSubstr("not a regular file")))
+                << dir;
     }
 
     // The command says the same and ends, without waiting on the pipe or
     // reading the device.
-    for (const fs::path& dir : {fifo, device}) {
-        auto [code, out, err] = RunCli({"show", dir.string()});
+    const std::string missing = std::string("dovrel: שגיאה: ") + kMissing + "\n";
+    const std::pair<std::string, ::testing::Matcher<std::string>> commands[] = {
+        {fifo.string(), missing},
+        {device.string(), missing},
+        {(good / "ISHP.FIX").string(), HasSubstr("Company directory not found")},
+        {std::string(), HasSubstr("Company directory not found")}};
+    for (const auto& [dir, error] : commands) {
+        auto [code, out, err] = Show(dir);
         EXPECT_EQ(code, 1) << dir;
-        EXPECT_EQ(err, std::string("dovrel: שגיאה: ") + kMissing + "\n");
-    }
-    for (const std::string& dir : {(good / "ISHP.FIX").string(), std::string()}) {
-        auto [code, out, err] = RunCli({"show", dir});
-        EXPECT_EQ(code, 1) << dir;
-        EXPECT_THAT(err, HasSubstr("Company directory not found")) << dir;
+        EXPECT_THAT(err, error) << dir;
     }
 }
 
@@ -159,16 +150,22 @@ TEST_F(HostileInputTest, EveryByteValueInEveryTextFieldAndHugeLineCounts) {
         }
         return json{{"hex", hex}};
     };
-    constexpr int kDocs = 52;  // 52 × 5 bytes of the reference cover 256 values
+    constexpr int kDocs = 52; // 52 × 5 bytes of the reference cover 256 values
+    const std::pair<const char*, int> lineFields[] = {
+        {"key", 12}, {"description", 40}, {"details", 8}};
+    const std::pair<const char*, int> docFields[] = {
+        {"account", 8},   {"customer", 30}, {"address1", 30}, {"address2", 30},
+        {"reference", 5}, {"remarks", 48},  {"remarks", 48},  {"remarks", 48}};
     json documents = json::array();
     for (int d = 0; d < kDocs; ++d) {
-        json line = {{"key", bytes(d, 12, 1)}, {"description", bytes(d, 40, 2)},
-                     {"details", bytes(d, 8, 3)}, {"price", 1}, {"quantity", 2}};
-        json doc = {{"type", 20}, {"account", bytes(d, 8, 4)}, {"customer", bytes(d, 30, 5)},
-                    {"address1", bytes(d, 30, 6)}, {"address2", bytes(d, 30, 7)},
-                    {"reference", bytes(d, 5, 8)},
-                    {"remarks", {bytes(d, 48, 9), bytes(d, 48, 10), bytes(d, 48, 11)}},
-                    {"lines", {line}}};
+        json line = json::parse(R"({"price": 1, "quantity": 2})"), doc = {{"type", 20}};
+        int salt = 1;
+        for (const auto& [field, width] : lineFields)
+            line[field] = bytes(d, width, salt++);
+        for (const auto& [field, width] : docFields)
+            (field == std::string("remarks") ? doc[field].emplace_back() : doc[field]) =
+                bytes(d, width, salt++);
+        doc["lines"] = {line};
         if (d == kDocs - 1)
             doc["lineCount"] = 255;
         documents.push_back(doc);
@@ -176,11 +173,8 @@ TEST_F(HostileInputTest, EveryByteValueInEveryTextFieldAndHugeLineCounts) {
     test::TestCompany company(json{{"documents", documents}}.dump());
     std::string path = company.path().string();
 
-    auto stateIsUtf8 = [&] {
-        std::string text;
-        EXPECT_NO_THROW(text = StateJson::Build(card).dump());  // strict: throws on bad UTF-8
-        EXPECT_EQ(json::parse(text), StateJson::Build(card));
-    };
+    // dump() is strict: it throws on bad UTF-8.
+    auto stateIsUtf8 = [&] { EXPECT_NO_THROW(json::parse(StateJson::Build(card).dump())); };
     int shown = 0;
     read(path, "First");
     while (card.PubPrevLocation != 0 && shown <= kDocs) {
@@ -202,8 +196,8 @@ TEST_F(HostileInputTest, EveryByteValueInEveryTextFieldAndHugeLineCounts) {
         read(path, "Next");
         std::string account = card.txtAccountKey.Text();
         std::string customer = card.txtCustomerName.Text();
-        for (const auto& [by, value] : {std::pair{"AccountKey", account},
-                                        std::pair{"CustomerName", customer}}) {
+        for (const auto& [by, value] :
+             {std::pair{"AccountKey", account}, std::pair{"CustomerName", customer}}) {
             card.PubSearchBy = by;
             card.PubSearchValue = Variant(value);
             card.PubPrevLocation = 0;
@@ -230,7 +224,7 @@ TEST_F(HostileInputTest, EveryByteValueInEveryTextFieldAndHugeLineCounts) {
     stateIsUtf8();
 
     // The command prints them as UTF-8 too.
-    auto [code, out, err] = RunCli({"show", path, "--json"});
+    auto [code, out, err] = Show(path, "--json");
     EXPECT_EQ(code, 0) << err;
     EXPECT_NO_THROW(json::parse(out).dump());
 }
