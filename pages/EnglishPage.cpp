@@ -21,7 +21,9 @@ void WriteStyleAndCompany(PageFile& page, const PageContext& c) {
     page.line("  .TD2{font-size : 10pt; font-weight=600; color: '#000000';}");
     page.line("  .TD3{font-size : 12pt; font-weight=600; color: '#000000';}");
     page.line("  .TD4{font-size : 16pt; font-weight=600; color: '#000000';}");
-    page.line("  .TD5{font-size : 10pt; font-weight=800; color: 'white';font-family: Arial;}");
+    // The heading and label cells stand on black: their white is written
+    // without quotes, which today's browsers drop, leaving black on black.
+    page.line("  .TD5{font-size : 10pt; font-weight=800; color: white;font-family: Arial;}");
     page.line("</STYLE>");
     page.line("</HEAD>");
     page.line("<BODY BGCOLOR='#FFFFFF'>");

@@ -68,6 +68,11 @@ try {
     expect('English heading ends with the reference', heading.endsWith(`\u00a0${controls.txtReference1}`), true);
     const to = tab.locator('td', { hasText: /^To:/ }).locator('xpath=following-sibling::td[1]');
     expect('English customer', await to.innerText(), controls.txtCustomerName);
+    // The headings and total labels stand in white on black.
+    const labels = await tab.evaluate(() => [...document.querySelectorAll('td.TD5')]
+        .map(td => getComputedStyle(td).color));
+    expect('English labels are white', labels.every(color => color === 'rgb(255, 255, 255)') &&
+           labels.length > 0, true);
     const firstLine = tab.locator('table[rules] tr').nth(1).locator('td');
     expect('English description', (await firstLine.nth(2).innerText()).trim(), state.grid[1][2]);
     await tab.screenshot({ path: join(outDir, 'english.png'), fullPage: true });
