@@ -9,6 +9,7 @@
 
 #include <climits>
 #include <map>
+#include <utility>
 
 namespace dovrel {
 
@@ -193,7 +194,12 @@ void ItemPicsForm::cmdSaveDef_Click() {
 void ItemPicsForm::CmdNew_Click() {
     if (!CheckDBFile())
         return;
-    ItemPicLines.AddItem("\t" + FromUtf8("תתתתתתתתתתתת") + "\t\t999\tpic001.jpg");
+    // Appended rather than added to a literal: g++ 12 warns wrongly on
+    // "literal" + std::string at -O2.
+    std::string row = "\t";
+    row += FromUtf8("תתתתתתתתתתתת");
+    row += "\t\t999\tpic001.jpg";
+    ItemPicLines.AddItem(std::move(row));
     rangeIds_.resize(static_cast<size_t>(ItemPicLines.Rows()), 0);
 }
 
