@@ -2,6 +2,7 @@
 // re-creation, and the failures that must leave a stored file as it was.
 
 #include "pictures/PictureDb.h"
+#include "ChildFailure.h"
 #include "TestCompany.h"
 #include "fixfiles/CurrentDocument.h"
 #include "pictures/PictureCollation.h"
@@ -26,6 +27,7 @@
 namespace dovrel {
 namespace {
 
+using test::FailureOf;
 using test::U;
 using test::W;
 using ::testing::HasSubstr;
@@ -36,40 +38,17 @@ Range R(Text fromKey, Text toKey, Text fromCode, Text toCode, Text pic) {
     return {0, fromKey, toKey, fromCode, toCode, pic};
 }
 
-std::string FailureOf(const std::function<void()>& work) {
-    try {
-        work();
-        return "";
-    } catch (const Error& e) {
-        return e.what();
-    }
-}
-
 // The failure of work in a child process as user "nobody" (when run as root)
-// and with a file size limit when one is given; what the child changes about
-// itself ends with it.
+// and with a file size limit when one is given.
 std::string FailureInChild(const std::function<void()>& work, rlim_t sizeLimit = 0) {
-    int fds[2];
-    if (pipe(fds) != 0)
-        return "pipe failed";
-    pid_t child = fork();
-    if (child == 0) {
-        rlimit limit{sizeLimit, sizeLimit};
-        bool ready = (geteuid() != 0 || (setgid(65534) == 0 && setuid(65534) == 0)) &&
-                     (sizeLimit == 0 || (signal(SIGXFSZ, SIG_IGN) != SIG_ERR &&
-                                         setrlimit(RLIMIT_FSIZE, &limit) == 0));
-        std::string answer = ready ? "-" + FailureOf(work) : "cannot prepare the child";
-        ssize_t written = write(fds[1], answer.data(), answer.size());
-        _exit(written == static_cast<ssize_t>(answer.size()) ? 0 : 1);
-    }
-    close(fds[1]);
-    std::string answer;
-    char buffer[512];
-    for (ssize_t n; (n = read(fds[0], buffer, sizeof buffer)) > 0;)
-        answer.append(buffer, static_cast<size_t>(n));
-    close(fds[0]);
-    waitpid(child, nullptr, 0);
-    return answer.starts_with("-") ? answer.substr(1) : "child failed: " + answer;
+    return test::FailureInChild(
+        [sizeLimit] {
+            rlimit limit{sizeLimit, sizeLimit};
+            return test::BecomeNobody() &&
+                   (sizeLimit == 0 ||
+                    (signal(SIGXFSZ, SIG_IGN) != SIG_ERR && setrlimit(RLIMIT_FSIZE, &limit) == 0));
+        },
+        work);
 }
 
 class PictureDbTest : public ::testing::Test {

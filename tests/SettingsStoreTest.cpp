@@ -1,5 +1,6 @@
 #include "platform/SettingsStore.h"
 
+#include "ChildFailure.h"
 #include "TestCompany.h"
 #include "platform/Error.h"
 
@@ -25,6 +26,9 @@
 namespace dovrel {
 namespace {
 
+using test::BecomeNobody;
+using test::FailureInChild;
+using test::FailureOf;
 using test::W;
 using ::testing::ElementsAre;
 using ::testing::HasSubstr;
@@ -71,45 +75,9 @@ TYPED_TEST(EveryStoreTest, KeepsHebrewTextMatchesNamesWithoutCaseAndKeepsPlacesA
     EXPECT_THROW(s.SaveSetting("Dovrel", "Params", "", "x"), Error);
 }
 
-// Runs work and gives its Error's description ("" when it succeeded).
-std::string FailureOf(const std::function<void()>& work) {
-    try {
-        work();
-        return "";
-    } catch (const Error& e) {
-        return e.what();
-    }
-}
-
-// The failure of work run in a child process after prepare (which returns
-// false when the child cannot be set up), so that what the child changes about
-// itself (its user, its file size limit) ends with it.
-std::string FailureInChild(const std::function<bool()>& prepare,
-                           const std::function<void()>& work) {
-    int fds[2];
-    if (pipe(fds) != 0)
-        return "pipe failed";
-    pid_t child = fork();
-    if (child == 0) {
-        std::string answer = prepare() ? "-" + FailureOf(work) : "cannot prepare the child";
-        ssize_t written = write(fds[1], answer.data(), answer.size());
-        _exit(written == static_cast<ssize_t>(answer.size()) ? 0 : 1);
-    }
-    close(fds[1]);
-    std::string answer;
-    char buffer[512];
-    for (ssize_t n; (n = read(fds[0], buffer, sizeof buffer)) > 0;)
-        answer.append(buffer, static_cast<size_t>(n));
-    close(fds[0]);
-    waitpid(child, nullptr, 0);
-    return answer.starts_with("-") ? answer.substr(1) : "child failed: " + answer;
-}
-
 // The same, where file modes matter: run as root, the work runs in a child as "nobody".
 std::string FailureAsUser(const std::function<void()>& work) {
-    return geteuid() != 0
-               ? FailureOf(work)
-               : FailureInChild([] { return setgid(65534) == 0 && setuid(65534) == 0; }, work);
+    return geteuid() != 0 ? FailureOf(work) : FailureInChild(BecomeNobody, work);
 }
 
 mode_t ModeOf(const std::filesystem::path& path) {
