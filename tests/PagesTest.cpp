@@ -88,7 +88,7 @@ TEST(PagePieces, AsIsCellsCellsRulesAndNumbers) {
 
 // A control with recording services on a private module state, pages going
 // to a private temporary directory.
-class PagesTest : public ::testing::Test {
+class PagesTest : public ::testing::Test, protected test::CardDesk<> {
 protected:
     void SetUp() override {
         setenv("TMPDIR", temp.str().c_str(), 1);
@@ -128,14 +128,6 @@ protected:
     }
 
     test::TempDir temp;
-    ModuleState state;
-    RecordedMessages messages;
-    MemorySettingsStore settings;
-    ClosingFormPresenter forms;
-    MemoryClipboard clipboard;
-    RecordingBrowser browser;
-    FixedClock clock{{2026, 12, 6}};
-    CardServices services{messages, settings, forms, clipboard, browser, clock};
     std::unique_ptr<Card> card;
     std::unique_ptr<test::TestCompany> company;
 };
