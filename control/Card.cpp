@@ -2,11 +2,11 @@
 
 #include "control/CardForms.h"
 #include "control/Surface.h"
-#include "pictures/ItemPicsForm.h"
 #include "fixfiles/AccountsFile.h"
 #include "fixfiles/ItemsFile.h"
 #include "fixfiles/ReadStock.h"
 #include "fixfiles/TextDecoding.h"
+#include "pictures/ItemPicsForm.h"
 #include "platform/Error.h"
 #include "platform/SettingsStore.h"
 
@@ -23,8 +23,9 @@ struct Card::OwnServices {
 };
 
 Card::Card(Messages& messages, ModuleState& shared)
-    : own_(std::make_unique<OwnServices>()), services_{messages,        own_->settings, own_->forms,
-                                                       own_->clipboard, own_->browser, own_->clock},
+    : own_(std::make_unique<OwnServices>()), services_{messages,      own_->settings,
+                                                       own_->forms,   own_->clipboard,
+                                                       own_->browser, own_->clock},
       shared_(shared) {
     buildControls();
 }

@@ -36,7 +36,7 @@ struct LineAmounts {
     double price = 0;
     uint8_t currency = 0;
     double quantity = 0;
-    double discount = 0;  // percent
+    double discount = 0; // percent
 
     bool isZero() const { return price == 0 && currency == 0 && quantity == 0 && discount == 0; }
 };

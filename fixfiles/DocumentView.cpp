@@ -8,12 +8,10 @@ namespace {
 // The eight headings of the lines grid, each left-aligned and followed by the
 // spaces that give the column its initial width.
 const std::string& DocLinesFormat() {
-    static const std::string format = FromUtf8("<שורה|<פריט" + std::string(20, ' ') +
-                                               "|<תאור" + std::string(70, ' ') +
-                                               "|<פרטים" + std::string(40, ' ') +
-                                               "|<כמות" + std::string(10, ' ') +
-                                               "|<מחיר" + std::string(20, ' ') +
-                                               "|<מטבע|<סהכ שח" + std::string(20, ' '));
+    static const std::string format =
+        FromUtf8("<שורה|<פריט" + std::string(20, ' ') + "|<תאור" + std::string(70, ' ') +
+                 "|<פרטים" + std::string(40, ' ') + "|<כמות" + std::string(10, ' ') + "|<מחיר" +
+                 std::string(20, ' ') + "|<מטבע|<סהכ שח" + std::string(20, ' '));
     return format;
 }
 

@@ -37,8 +37,10 @@ enum class SearchBy { None, AccountKey, Reference1, CustomerName, ItemKey, Detai
 
 SearchBy ParseSearchBy(const std::string& name) {
     static const std::pair<const char*, SearchBy> names[] = {
-        {"AccountKey", SearchBy::AccountKey}, {"Reference1", SearchBy::Reference1},
-        {"CustomerName", SearchBy::CustomerName}, {"ItemKey", SearchBy::ItemKey},
+        {"AccountKey", SearchBy::AccountKey},
+        {"Reference1", SearchBy::Reference1},
+        {"CustomerName", SearchBy::CustomerName},
+        {"ItemKey", SearchBy::ItemKey},
         {"Details", SearchBy::Details}};
     for (const auto& [text, by] : names)
         if (EqualsNoCase(name, text))
@@ -71,7 +73,7 @@ public:
 private:
     struct Candidate {
         bool accepted = false;
-        int64_t end = 0;  // the last record the document consumed
+        int64_t end = 0; // the last record the document consumed
     };
 
     Walk planWalk(const std::string& direction, int64_t records);
@@ -150,8 +152,8 @@ int32_t StockScan::run(const std::string& pCompPath, int16_t pWizFile,
     // A row without a file would name only the company directory; it is
     // treated as a missing file, never opened.
     bool hasFile = row.fileNumber >= 1 && row.fileNumber <= 4;
-    std::string path = hasFile ? pCompPath + ctx_.docFiles[static_cast<size_t>(row.fileNumber)]
-                               : std::string();
+    std::string path =
+        hasFile ? pCompPath + ctx_.docFiles[static_cast<size_t>(row.fileNumber)] : std::string();
     if (!hasFile || !FileExists(path)) {
         ctx_.messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("שגיאה"),
                            FromUtf8("קבצי מסמכים לא נמצאו"));
@@ -343,8 +345,8 @@ void StockScan::processLine(const unsigned char* rec, uint8_t docType, bool& mat
         if (!itemKey.empty()) {
             int lineNumber = rec[162];
             if (lineNumber < 1 || lineNumber > kMaxDocLines)
-                throw Error("Line number " + std::to_string(lineNumber) +
-                            " is outside 1 to " + std::to_string(kMaxDocLines));
+                throw Error("Line number " + std::to_string(lineNumber) + " is outside 1 to " +
+                            std::to_string(kMaxDocLines));
             double discount = Int16At(rec, 156) / 100.0;
             line.itemKey = FixedWidth(itemKey, 12);
             ctx_.doc.amounts[static_cast<size_t>(lineNumber)] = {price, currency, quantity,
@@ -399,8 +401,8 @@ void StockScan::accept(const Record& header, const Record& cont, const Date& dat
 
 void StockScan::nothingFound() {
     for (TextBox* box : {&view_.txtAccountKey, &view_.txtReference1, &view_.txtCustomerName,
-                         &view_.txtDate, &view_.txtAddress1, &view_.txtAddress2,
-                         &view_.txtTotalVat, &view_.txtVatValue, &view_.txtTotal1})
+                         &view_.txtDate, &view_.txtAddress1, &view_.txtAddress2, &view_.txtTotalVat,
+                         &view_.txtVatValue, &view_.txtTotal1})
         box->setText({});
     view_.InitDocLines();
     ctx_.doc.lineCount = 0;

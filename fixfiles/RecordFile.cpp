@@ -78,9 +78,9 @@ void RecordFile::fill(int64_t offset) {
     block.start = start;
     block.filled = 0;
     while (block.filled < block.bytes.size()) {
-        ssize_t got = ::pread(fd_, block.bytes.data() + block.filled,
-                              block.bytes.size() - block.filled,
-                              start + static_cast<int64_t>(block.filled));
+        ssize_t got =
+            ::pread(fd_, block.bytes.data() + block.filled, block.bytes.size() - block.filled,
+                    start + static_cast<int64_t>(block.filled));
         if (got < 0 && errno == EINTR)
             continue;
         if (got < 0)

@@ -48,8 +48,7 @@ inline void Require(bool holds, const char* what) {
 // value is 0 and every text empty. rest() is what has not been taken.
 class Bytes {
 public:
-    Bytes(const uint8_t* data, size_t size)
-        : text_(reinterpret_cast<const char*>(data), size) {}
+    Bytes(const uint8_t* data, size_t size) : text_(reinterpret_cast<const char*>(data), size) {}
 
     uint8_t byte() {
         if (text_.empty())

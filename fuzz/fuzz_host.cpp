@@ -59,10 +59,12 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     size_t start = 0;
     while (start <= input.size()) {
         size_t end = std::min(input.find('\n', start), input.size());
-        std::optional<std::string> reply = session.handle(WithCompany(input.substr(start, end - start)));
+        std::optional<std::string> reply =
+            session.handle(WithCompany(input.substr(start, end - start)));
         if (reply) {
             nlohmann::json answer = nlohmann::json::parse(*reply, nullptr, false);
-            Require(answer.is_object() && answer.contains("ok"), "every answer is an object with ok");
+            Require(answer.is_object() && answer.contains("ok"),
+                    "every answer is an object with ok");
         }
         start = end + 1;
     }

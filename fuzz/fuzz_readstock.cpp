@@ -22,7 +22,7 @@ using dovrel::fuzz::Require;
 
 namespace {
 
-constexpr int16_t kFirstShipRow = 13;  // types 20 to 23 live in ISHP.FIX
+constexpr int16_t kFirstShipRow = 13; // types 20 to 23 live in ISHP.FIX
 
 struct Request {
     int16_t row = kFirstShipRow;
@@ -39,16 +39,16 @@ int16_t PickRow(uint8_t b) {
 }
 
 std::string PickFromDate(uint8_t b, Bytes& in) {
-    static const char* const dates[] = {"", "01/01/1980", "15/03/2024", "1/1/99",
-                                        "31/12/2155", "0/0/0", "32/13/2024", "a/b/c"};
+    static const char* const dates[] = {"",           "01/01/1980", "15/03/2024", "1/1/99",
+                                        "31/12/2155", "0/0/0",      "32/13/2024", "a/b/c"};
     if (b < 8)
         return dates[b];
     return in.text(10);
 }
 
 Request ReadRequest(Bytes& in) {
-    static const char* const searches[] = {"", "AccountKey", "Reference1", "CustomerName",
-                                           "ItemKey", "Details", "Nothing", "AccountKey"};
+    static const char* const searches[] = {"",        "AccountKey", "Reference1", "CustomerName",
+                                           "ItemKey", "Details",    "Nothing",    "AccountKey"};
     Request r;
     r.row = PickRow(in.byte());
     uint8_t search = in.byte() % 8;
@@ -73,7 +73,8 @@ void Walk(Card& card, const std::string& dir, const Request& r, const std::strin
     Require(card.ProgressFill.Width() == 0, "the progress bar is empty after a read");
     int16_t lines = card.shared().Doc.lineCount;
     Require(lines >= 0 && lines <= 40, "a document has 0 to 40 lines");
-    Require(card.DocLines.Rows() >= 1 && card.DocLines.Cols() == 8, "the lines grid keeps its shape");
+    Require(card.DocLines.Rows() >= 1 && card.DocLines.Cols() == 8,
+            "the lines grid keeps its shape");
 }
 
 } // namespace

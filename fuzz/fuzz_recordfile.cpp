@@ -32,7 +32,8 @@ void CheckRecord(RecordFile& file, std::string_view bytes, int64_t n) {
     }
     Require(n >= 1, "a record number below 1 is an error");
     bool whole = n * length <= static_cast<int64_t>(bytes.size());
-    Require((record != nullptr) == whole, "a record is there exactly when the file holds all of it");
+    Require((record != nullptr) == whole,
+            "a record is there exactly when the file holds all of it");
     if (record != nullptr)
         Require(std::memcmp(record, bytes.data() + (n - 1) * length, file.recordLength()) == 0,
                 "a record holds the file's bytes");

@@ -74,17 +74,17 @@ void Numbers(std::string_view text) {
 
 void Currencies(std::string_view text) {
     CompanyRecord exact;
-    exact.bytes.assign(text);  // a record of any length, as a damaged file may leave it
+    exact.bytes.assign(text); // a record of any length, as a damaged file may leave it
     CompanyRecord laid;
     laid.bytes.replace(kCurrencyNamesOffset,
                        std::min(text.size(), laid.bytes.size() - kCurrencyNamesOffset),
                        text.substr(0, laid.bytes.size() - kCurrencyNamesOffset));
     int16_t code = text.size() >= 2 ? static_cast<int16_t>(static_cast<uint8_t>(text[0]) |
-                                                            (static_cast<uint8_t>(text[1]) << 8))
+                                                           (static_cast<uint8_t>(text[1]) << 8))
                                     : 0;
-    for (int16_t c : {code, static_cast<int16_t>(0), static_cast<int16_t>(9),
-                      static_cast<int16_t>(10), static_cast<int16_t>(18), static_cast<int16_t>(19),
-                      static_cast<int16_t>(21)}) {
+    for (int16_t c :
+         {code, static_cast<int16_t>(0), static_cast<int16_t>(9), static_cast<int16_t>(10),
+          static_cast<int16_t>(18), static_cast<int16_t>(19), static_cast<int16_t>(21)}) {
         CurrencyNames(c, exact);
         CurrencyNames(c, laid);
     }

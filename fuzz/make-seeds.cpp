@@ -116,8 +116,7 @@ void ItemSeeds(const fs::path& out, const fs::path& company, int index) {
             continue;
         std::string file = ReadAll(company / name);
         for (char count : {char(3), char(40), char(-1)})
-            Write(out / "itemfiles",
-                  "company" + std::to_string(index) + "-" + std::to_string(n++),
+            Write(out / "itemfiles", "company" + std::to_string(index) + "-" + std::to_string(n++),
                   std::string(1, count) + keys + file);
     }
 }
@@ -132,7 +131,8 @@ void RecordSeeds(const fs::path& out, const fs::path& company, int index) {
             continue;
         std::string file = ReadAll(company / name).substr(0, 3000);
         int small = length > 256 ? 99 : length;
-        std::string reads = std::string{3, 2, 0, 1, 0, static_cast<char>(0xFF), static_cast<char>(0xFF)};
+        std::string reads =
+            std::string{3, 2, 0, 1, 0, static_cast<char>(0xFF), static_cast<char>(0xFF)};
         for (char block : {char(0), char(10), char(0xFF)})
             Write(out / "recordfile", "company" + std::to_string(index) + "-" + std::to_string(n++),
                   std::string{static_cast<char>(small - 1), block} + reads + file);
@@ -141,8 +141,13 @@ void RecordSeeds(const fs::path& out, const fs::path& company, int index) {
 
 void TextSeeds(const fs::path& out) {
     const std::string texts[] = {
-        DosVisual("שלום עולם"), DosVisual("רח' הרצל 45 (פינה)"), DosVisual("Widget Pro 3 ב-5"),
-        "  padded text   \tPADDED", "15/03/2024", "1/2/05\t31/12/99", "0/13/2024",
+        DosVisual("שלום עולם"),
+        DosVisual("רח' הרצל 45 (פינה)"),
+        DosVisual("Widget Pro 3 ב-5"),
+        "  padded text   \tPADDED",
+        "15/03/2024",
+        "1/2/05\t31/12/99",
+        "0/13/2024",
         std::string("\x00\x00\x00\x00\x00\x00\xF0\x3F\x0A\x00", 10),
         std::string("\x00\x00\x00\x00\x00\x00\xF8\x7F\x00\x00\x00\x00\x00\x00\xF0\x7F", 16),
         std::string("\x7B\x14\xAE\x47\xE1\x7A\x84\x3F") + DosVisual("יורו"),
@@ -168,7 +173,7 @@ int main(int argc, char** argv) {
             WriteCompany(description, company);
             if (fs::exists(company / "ISHP.FIX"))
                 StockSeeds(out, ReadAll(company / "ISHP.FIX"), index);
-                PageSeeds(out, ReadAll(company / "ISHP.FIX"), index);
+            PageSeeds(out, ReadAll(company / "ISHP.FIX"), index);
             ItemSeeds(out, company, index);
             RecordSeeds(out, company, index);
             ++index;

@@ -74,7 +74,7 @@ int PictureCollation::compare(std::string_view a, std::string_view b) const {
 int PictureCollation::compareUtf8(std::string_view a, std::string_view b) const {
     UErrorCode status = U_ZERO_ERROR;
     UCollationResult result = ucol_strcollUTF8(collator_, a.data(), CheckedLength(a), b.data(),
-                                                CheckedLength(b), &status);
+                                               CheckedLength(b), &status);
     if (U_FAILURE(status))
         throw Error(std::string("Cannot compare two texts: ") + u_errorName(status));
     return static_cast<int>(result);
@@ -85,7 +85,7 @@ std::string PictureCollation::sortKey(std::string_view text) const {
     std::vector<uint8_t> key(wide.size() * 4 + 16);
     for (;;) {
         int32_t needed = ucol_getSortKey(collator_, wide.data(), static_cast<int32_t>(wide.size()),
-                                          key.data(), static_cast<int32_t>(key.size()));
+                                         key.data(), static_cast<int32_t>(key.size()));
         if (needed <= 0)
             throw Error("Cannot make the sort key of a text");
         if (static_cast<size_t>(needed) <= key.size())

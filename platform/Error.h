@@ -19,8 +19,7 @@ public:
 
 // Runs step and ignores any failure in it: the handlers that go on with
 // their next step after a failure run each step through this.
-template <typename Step>
-void IgnoringErrors(Step&& step) noexcept {
+template <typename Step> void IgnoringErrors(Step&& step) noexcept {
     try {
         step();
     } catch (...) {

@@ -9,8 +9,7 @@ namespace dovrel {
 // A minimal observer list: models announce their changes through it, and
 // views (the Qt widgets, the automation host) listen. Listeners are called in
 // the order they connected, on the caller's thread.
-template <typename... Args>
-class Signal {
+template <typename... Args> class Signal {
 public:
     using Slot = std::function<void(Args...)>;
 

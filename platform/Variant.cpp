@@ -4,8 +4,8 @@
 
 #include <cctype>
 #include <charconv>
-#include <cstdint>
 #include <cmath>
+#include <cstdint>
 #include <cstdio>
 
 namespace dovrel {
@@ -107,7 +107,7 @@ double Variant::toNumber() const {
 int64_t RoundToWhole(double value, int64_t min, int64_t max) {
     if (!std::isfinite(value))
         throw Error("Overflow");
-    double rounded = std::nearbyint(value);  // the default mode rounds halves to even
+    double rounded = std::nearbyint(value); // the default mode rounds halves to even
     if (rounded < static_cast<double>(min) || rounded > static_cast<double>(max))
         throw Error("Overflow");
     return static_cast<int64_t>(rounded);

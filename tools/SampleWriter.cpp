@@ -934,8 +934,7 @@ LineFields LineFieldsOf(const LineData& line, int docType, int lineNumber) {
         throw Error("line discount " + std::to_string(line.discount) +
                     " is outside -327.68 to 327.67");
     f.discount = *discount;
-    f.total =
-        DoubleBytes(line.price * line.rate * line.quantity * (100 - line.discount) / 100);
+    f.total = DoubleBytes(line.price * line.rate * line.quantity * (100 - line.discount) / 100);
     f.lineNumber = lineNumber;
     return f;
 }
