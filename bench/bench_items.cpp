@@ -24,7 +24,7 @@ std::string ItemsFile() {
 // A document of 40 lines: items spread over the whole file, the last two
 // lines with keys the file does not have.
 void FillDocument(CurrentDocument& doc) {
-    RecordFile file(ItemsFile(), kItmRecordLength);
+    RecordFile file(Path(ItemsFile()), kItmRecordLength);
     int64_t last = LastScanRecord(file.length(), kItmRecordLength);
     doc.clearLines();
     for (int k = 1; k <= kLines; ++k) {

@@ -161,8 +161,8 @@ int32_t Card::ReadStock(std::string pCompPath, int16_t& pWizFile, std::string& p
                         Variant& pSearchValue, std::string& pStartFrom, std::string& pFromDate) {
     StockContext context{shared_.DocTypes, shared_.DocFiles, shared_.Company, shared_.Doc,
                          services_.messages};
-    return dovrel::ReadStock(*this, context, pCompPath, pWizFile, pSearchBy, pSearchValue,
-                             pStartFrom, pFromDate);
+    return dovrel::ReadStock(*this, context, shared_.Paths.native(pCompPath), pWizFile, pSearchBy,
+                             pSearchValue, pStartFrom, pFromDate);
 }
 
 Variant Card::CompanyTitle() const {
@@ -218,11 +218,13 @@ void Card::PicPath(const Variant& value) {
 }
 
 Variant Card::ReadITM(std::string& CompPath) {
-    return dovrel::ReadITM(CompPath, shared_.Doc, {ProgressFrame, ProgressFill});
+    return dovrel::ReadITM(shared_.Paths.native(CompPath), shared_.Doc,
+                           {ProgressFrame, ProgressFill});
 }
 
 Variant Card::ReadACT(std::string& CompPath) {
-    return dovrel::ReadACT(CompPath, shared_.Accounts, {ProgressFrame, ProgressFill});
+    return dovrel::ReadACT(shared_.Paths.native(CompPath), shared_.Accounts,
+                           {ProgressFrame, ProgressFill});
 }
 
 Form& Card::form(const std::string& name) {

@@ -94,7 +94,7 @@ public:
     // needs them, the items are read, then the page the language list asks
     // for is written at path. False, and nothing written, when no language
     // is chosen.
-    bool WritePage(const std::string& path);
+    bool WritePage(const Path& path);
 
     // Moves one property of a control (kind 1 Text, 2 ListIndex, 3 Value) to
     // the settings store (Action 1) or from it (Action 2).

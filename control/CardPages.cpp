@@ -64,7 +64,7 @@ void Card::CreateHTML(std::string& pFileName, int16_t& pDocFormat) {
     PageSettings settings = preparePage();
     PageView view = pageView(txtTitle.Text().empty() ? cmbDocType.Text() : txtTitle.Text());
     PageContext context(view, shared_.Doc, settings, services_.clock.Today(), pDocFormat);
-    PageFile page(pFileName);
+    PageFile page(shared_.Paths.native(pFileName));
     OpenPage open(*this, page);
     WriteHebrewPage(page, context);
     page.commit();
@@ -81,7 +81,7 @@ void Card::CreateHTMLEng(std::string& pFileName, bool& pUseFName) {
     }
     PageView view = pageView(std::move(title));
     PageContext context(view, shared_.Doc, settings, services_.clock.Today());
-    PageFile page(pFileName);
+    PageFile page(shared_.Paths.native(pFileName));
     WriteEnglishPage(page, context, pUseFName, shared_.Company);
     page.commit();
 }
@@ -102,12 +102,12 @@ std::string Card::RulesValue() {
     return RulesFor(cmbRules.ListIndex());
 }
 
-bool Card::WritePage(const std::string& path) {
+bool Card::WritePage(const Path& path) {
     std::string compDir = shared_.CompDir;
-    ReadAdf(compDir, shared_.Company);
+    ReadAdf(shared_.Paths.native(compDir), shared_.Company);
     if (ChkWithDrawing.Value() == 1 || ChkUseFName.Value() == 1)
         ReadITM(compDir);
-    std::string file = path;
+    std::string file = shared_.Paths.text(path);
     int16_t format = kPricedPage;
     bool useForeignNames = ChkUseFName.Value() == 1;
     switch (CmbDocLang.ListIndex()) {
@@ -131,12 +131,11 @@ bool Card::WritePage(const std::string& path) {
 // is shown as a message and opens nothing.
 void Card::PrintButt_Click() {
     try {
-        std::string path = PrintFilePath();
+        Path path = PrintFilePath();
         if (WritePage(path))
             services_.browser.Open(path);
     } catch (const std::exception& e) {
-        services_.messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("תקלה"),
-                                FromUtf8(e.what()));
+        ShowFailure(services_.messages, "תקלה", e);
     }
 }
 

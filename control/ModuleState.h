@@ -5,6 +5,7 @@
 #include "fixfiles/CurrentDocument.h"
 #include "fixfiles/DocTypes.h"
 #include "platform/Form.h"
+#include "platform/PathNames.h"
 
 #include <map>
 #include <memory>
@@ -34,6 +35,9 @@ struct ModuleState {
     std::string CompTitle;
     std::string PicX;
     std::string PicY;
+    // The native paths behind the path texts above that code page 1255
+    // cannot hold.
+    PathNames Paths;
     // The side forms by name, each made on first use and kept.
     std::map<std::string, std::unique_ptr<Form>> Forms;
 

@@ -44,8 +44,8 @@ void AddAccount(AccountsTable& table, const unsigned char* record) {
 
 } // namespace
 
-bool ReadACT(const std::string& CompPath, AccountsTable& table, ProgressBar progress) {
-    RecordFile file(ResolvePath(CompPath + "\\ACT.fix"), kActRecordLength);
+bool ReadACT(const Path& CompPath, AccountsTable& table, ProgressBar progress) {
+    RecordFile file(ResolvePath(CompPath.plus("\\ACT.fix")), kActRecordLength);
     int64_t last = LastScanRecord(file.length(), kActRecordLength);
     ProgressReset resetter(progress);
     table.AccountCount = 0;

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "fixfiles/ProgressBar.h"
+#include "platform/Path.h"
 
 #include <cstdint>
 #include <string>
@@ -30,7 +31,7 @@ struct AccountsTable {
 // still true, with the accounts read so far. A missing or unreadable file
 // raises an error before the table is touched; an error during the scan
 // leaves it partly filled.
-bool ReadACT(const std::string& CompPath, AccountsTable& table, ProgressBar progress);
+bool ReadACT(const Path& CompPath, AccountsTable& table, ProgressBar progress);
 
 // A copy of the first entry whose key equals key without regard to letter
 // case; when there is none, an empty key and "ריק" in the other three fields.

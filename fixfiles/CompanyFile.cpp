@@ -25,9 +25,9 @@ std::string CompanyRecord::currencyName(int index) const {
     return name;
 }
 
-bool ReadAdf(const std::string& pCompPath, CompanyRecord& company) {
+bool ReadAdf(const Path& pCompPath, CompanyRecord& company) {
     try {
-        std::string path = pCompPath + "\\adf.fix";
+        Path path = pCompPath.plus("\\adf.fix");
         if (!FileExists(path))
             return false;
         RecordFile file(ResolvePath(path), kAdfRecordLength);

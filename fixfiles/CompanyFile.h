@@ -1,5 +1,7 @@
 #pragma once
 
+#include "platform/Path.h"
+
 #include <array>
 #include <string>
 #include <string_view>
@@ -27,6 +29,6 @@ struct CompanyRecord {
 // Reads record 1 of the company's adf.fix into the company record. False when
 // the file is missing, short or unreadable; the record then keeps what it had.
 // Never raises an error.
-bool ReadAdf(const std::string& pCompPath, CompanyRecord& company);
+bool ReadAdf(const Path& pCompPath, CompanyRecord& company);
 
 } // namespace dovrel

@@ -1,5 +1,7 @@
 #include "fixfiles/DateSerial.h"
 
+#include "platform/Ascii.h"
+
 #include "platform/Error.h"
 
 #include <cstdio>
@@ -59,12 +61,10 @@ constexpr int kMaxPart = 32767;
 // A whole number as the date text allows it: spaces around it, an optional
 // sign, then digits only.
 int ParsePart(std::string_view text) {
-    size_t first = text.find_first_not_of(' ');
-    size_t last = text.find_last_not_of(' ');
-    if (first == std::string_view::npos) {
+    std::string_view number = Trim(text);
+    if (number.empty()) {
         throw Error("Type mismatch");
     }
-    std::string_view number = text.substr(first, last - first + 1);
     bool negative = number.front() == '-';
     if (number.front() == '-' || number.front() == '+') {
         number.remove_prefix(1);

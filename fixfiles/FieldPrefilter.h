@@ -1,5 +1,7 @@
 #pragma once
 
+#include "platform/Ascii.h"
+
 #include <array>
 #include <cstdint>
 #include <string_view>
@@ -68,8 +70,7 @@ private:
             ByteTables t;
             for (int i = 0; i < 256; ++i) {
                 auto c = static_cast<unsigned char>(i);
-                bool latin =
-                    (c >= '0' && c <= '9') || (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z');
+                bool latin = IsAsciiAlnum(static_cast<char>(c));
                 t.latin[c] = latin ? Spread(Fold(c)) : 0;
                 t.decoded[c] = Decoded(c);
             }
@@ -81,7 +82,7 @@ private:
     static void set(Mask& mask, unsigned char c) { mask[c >> 6] |= uint64_t{1} << (c & 63); }
 
     static unsigned char Fold(unsigned char c) {
-        return (c >= 'A' && c <= 'Z') ? static_cast<unsigned char>(c + ('a' - 'A')) : c;
+        return static_cast<unsigned char>(AsciiLower(static_cast<char>(c)));
     }
 
     // The character a stored byte becomes in the decoded text, case folded.

@@ -1,5 +1,7 @@
 #include "fixfiles/ItemsFile.h"
 
+#include "platform/Ascii.h"
+
 #include "fixfiles/FieldPrefilter.h"
 #include "fixfiles/ProgressReset.h"
 #include "fixfiles/RecordFields.h"
@@ -24,11 +26,7 @@ constexpr int64_t kProgressEvery = 5;
 
 // Keys compare without regard to the case of Latin letters only.
 std::string FoldKey(std::string_view key) {
-    std::string folded(key);
-    for (char& c : folded)
-        if (c >= 'A' && c <= 'Z')
-            c = static_cast<char>(c - 'A' + 'a');
-    return folded;
+    return AsciiFold(key);
 }
 
 // Each distinct trimmed item key of the document, to the first entry that
@@ -88,8 +86,8 @@ int64_t LastScanRecord(int64_t fileLength, size_t recordLength) {
     return whole;
 }
 
-bool ReadITM(const std::string& CompPath, CurrentDocument& doc, ProgressBar progress) {
-    RecordFile file(ResolvePath(CompPath + "\\ITM.fix"), kItmRecordLength);
+bool ReadITM(const Path& CompPath, CurrentDocument& doc, ProgressBar progress) {
+    RecordFile file(ResolvePath(CompPath.plus("\\ITM.fix")), kItmRecordLength);
     int64_t last = LastScanRecord(file.length(), kItmRecordLength);
     ProgressReset resetter(progress);
     // One lookup per item record. When several records carry the same key,

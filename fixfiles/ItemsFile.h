@@ -2,6 +2,7 @@
 
 #include "fixfiles/CurrentDocument.h"
 #include "fixfiles/ProgressBar.h"
+#include "platform/Path.h"
 
 #include <string>
 
@@ -14,7 +15,7 @@ constexpr size_t kItmRecordLength = 500;
 // a file that becomes shorter during the scan ends it early, still true, with
 // the items read so far applied. A missing or unreadable file raises an error
 // before anything is touched.
-bool ReadITM(const std::string& CompPath, CurrentDocument& doc, ProgressBar progress);
+bool ReadITM(const Path& CompPath, CurrentDocument& doc, ProgressBar progress);
 
 // The last record ReadITM and ReadACT read: (length / record length) - 1,
 // rounded to the nearest whole number, halves to even. Records 2 up to it are

@@ -67,7 +67,7 @@ public:
         : view_(view), ctx_(context), searchBy_(ParseSearchBy(pSearchBy)),
           searchValue_(pSearchValue), progress_{view.ProgressFrame, view.ProgressFill} {}
 
-    int32_t run(const std::string& pCompPath, int16_t pWizFile, const std::string& pStartFrom,
+    int32_t run(const Path& pCompPath, int16_t pWizFile, const std::string& pStartFrom,
                 const std::string& pFromDate);
 
 private:
@@ -144,16 +144,16 @@ std::string AccountKeyOf(const unsigned char* header) {
     return TrimCopy(LogicalText(Field(header, 2, 8)));
 }
 
-int32_t StockScan::run(const std::string& pCompPath, int16_t pWizFile,
-                       const std::string& pStartFrom, const std::string& pFromDate) {
+int32_t StockScan::run(const Path& pCompPath, int16_t pWizFile, const std::string& pStartFrom,
+                       const std::string& pFromDate) {
     if (pWizFile < 0 || pWizFile >= kDocTypeRows)
         throw Error("Document type row " + std::to_string(pWizFile) + " is outside the table");
     const DocTypeRow& row = ctx_.docTypes[static_cast<size_t>(pWizFile)];
     // A row without a file would name only the company directory; it is
     // treated as a missing file, never opened.
     bool hasFile = row.fileNumber >= 1 && row.fileNumber <= 4;
-    std::string path =
-        hasFile ? pCompPath + ctx_.docFiles[static_cast<size_t>(row.fileNumber)] : std::string();
+    Path path =
+        hasFile ? pCompPath.plus(ctx_.docFiles[static_cast<size_t>(row.fileNumber)]) : Path();
     if (!hasFile || !FileExists(path)) {
         ctx_.messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("שגיאה"),
                            FromUtf8("קבצי מסמכים לא נמצאו"));
@@ -410,7 +410,7 @@ void StockScan::nothingFound() {
 
 } // namespace
 
-int32_t ReadStock(DocumentView& view, const StockContext& context, const std::string& pCompPath,
+int32_t ReadStock(DocumentView& view, const StockContext& context, const Path& pCompPath,
                   int16_t pWizFile, const std::string& pSearchBy, const Variant& pSearchValue,
                   const std::string& pStartFrom, const std::string& pFromDate) {
     try {

@@ -5,6 +5,7 @@
 #include "fixfiles/DocTypes.h"
 #include "fixfiles/DocumentView.h"
 #include "platform/Messages.h"
+#include "platform/Path.h"
 #include "platform/Variant.h"
 
 #include <cstdint>
@@ -30,7 +31,7 @@ struct StockContext {
 // fills the view's boxes and grid and the current document. Returns the record
 // number where the scan stopped, or 0 when the file is missing or an error was
 // reported in a message box.
-int32_t ReadStock(DocumentView& view, const StockContext& context, const std::string& pCompPath,
+int32_t ReadStock(DocumentView& view, const StockContext& context, const Path& pCompPath,
                   int16_t pWizFile, const std::string& pSearchBy, const Variant& pSearchValue,
                   const std::string& pStartFrom, const std::string& pFromDate);
 

@@ -12,8 +12,8 @@
 
 namespace dovrel {
 
-RecordFile::RecordFile(const std::string& path, size_t recordLength, size_t blockSize)
-    : path_(path), recordLength_(recordLength),
+RecordFile::RecordFile(const Path& path, size_t recordLength, size_t blockSize)
+    : path_(path.shown()), recordLength_(recordLength),
       lastNumber_(std::numeric_limits<int64_t>::max() /
                   std::max<int64_t>(1, static_cast<int64_t>(recordLength))),
       blocks_{{std::vector<unsigned char>(std::max(blockSize, recordLength))},
@@ -22,16 +22,16 @@ RecordFile::RecordFile(const std::string& path, size_t recordLength, size_t bloc
     // hanging the open; such a file is then refused below.
     fd_ = ::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY);
     if (fd_ < 0)
-        ThrowSystemError("Cannot open", path, errno);
+        ThrowSystemError("Cannot open", path_, errno);
     struct stat st;
     if (::fstat(fd_, &st) != 0) {
         int err = errno;
         ::close(fd_);
-        ThrowSystemError("Cannot read", path, err);
+        ThrowSystemError("Cannot read", path_, err);
     }
     if (!S_ISREG(st.st_mode)) {
         ::close(fd_);
-        throw Error("Cannot read " + path + ": not a regular file");
+        throw Error("Cannot read " + path_ + ": not a regular file");
     }
     length_ = st.st_size;
 }

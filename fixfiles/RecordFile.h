@@ -1,5 +1,7 @@
 #pragma once
 
+#include "platform/Path.h"
+
 #include <cstddef>
 #include <cstdint>
 #include <string>
@@ -18,7 +20,7 @@ namespace dovrel {
 class RecordFile {
 public:
     // Opens the file (a file-system path); an error when it cannot be opened.
-    RecordFile(const std::string& path, size_t recordLength, size_t blockSize = 256 * 1024);
+    RecordFile(const Path& path, size_t recordLength, size_t blockSize = 256 * 1024);
     ~RecordFile();
     RecordFile(const RecordFile&) = delete;
     RecordFile& operator=(const RecordFile&) = delete;

@@ -1,5 +1,7 @@
 #include "fixfiles/TextDecoding.h"
 
+#include "platform/Ascii.h"
+
 #include "fixfiles/CompanyFile.h"
 #include "platform/Encoding.h"
 
@@ -18,17 +20,8 @@ bool IsDosHebrew(unsigned char c) {
     return c >= kDosAlef && c <= kDosTav;
 }
 
-bool IsLatinOrDigit(unsigned char c) {
-    return (c >= '0' && c <= '9') || (c >= 'A' && c <= 'Z') || (c >= 'a' && c <= 'z');
-}
-
 char ToWindowsHebrew(unsigned char c) {
     return static_cast<char>(c + kWindowsOffset);
-}
-
-unsigned char FoldCase(char c) {
-    auto u = static_cast<unsigned char>(c);
-    return (u >= 'A' && u <= 'Z') ? static_cast<unsigned char>(u + ('a' - 'A')) : u;
 }
 
 // The result grows at both ends. Every input byte adds at most one byte and
@@ -66,7 +59,7 @@ std::string LogicalText(std::string_view text) {
         if (IsDosHebrew(c)) {
             result.pushBack(ToWindowsHebrew(c));
             hebrew = true;
-        } else if (IsLatinOrDigit(c)) {
+        } else if (IsAsciiAlnum(static_cast<char>(c))) {
             if (!latin) {
                 result.pushFront(' ');
             }
@@ -113,44 +106,6 @@ char VisualChar(char c) {
     }
     auto u = static_cast<unsigned char>(c);
     return IsDosHebrew(u) ? ToWindowsHebrew(u) : c;
-}
-
-std::string_view Trim(std::string_view text) {
-    size_t first = text.find_first_not_of(' ');
-    if (first == std::string_view::npos) {
-        return {};
-    }
-    size_t last = text.find_last_not_of(' ');
-    return text.substr(first, last - first + 1);
-}
-
-std::string TrimCopy(std::string_view text) {
-    return std::string(Trim(text));
-}
-
-bool EqualsNoCase(std::string_view a, std::string_view b) {
-    if (a.size() != b.size()) {
-        return false;
-    }
-    for (size_t i = 0; i < a.size(); ++i) {
-        if (FoldCase(a[i]) != FoldCase(b[i])) {
-            return false;
-        }
-    }
-    return true;
-}
-
-bool ContainsNoCase(std::string_view haystack, std::string_view needle) {
-    if (needle.size() > haystack.size()) {
-        return false;
-    }
-    size_t lastStart = haystack.size() - needle.size();
-    for (size_t start = 0; start <= lastStart; ++start) {
-        if (EqualsNoCase(haystack.substr(start, needle.size()), needle)) {
-            return true;
-        }
-    }
-    return false;
 }
 
 namespace {

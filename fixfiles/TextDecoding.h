@@ -1,5 +1,7 @@
 #pragma once
 
+#include "platform/Ascii.h"
+
 #include <cstdint>
 #include <string>
 #include <string_view>
@@ -19,14 +21,6 @@ std::string LogicalText(std::string_view text);
 // Keeps the stored order, maps the Hebrew letters and mirrors brackets.
 std::string VisualText(std::string_view text);
 char VisualChar(char c);
-
-// Removes leading and trailing spaces (0x20 only).
-std::string_view Trim(std::string_view text);
-std::string TrimCopy(std::string_view text);
-
-// Equality and containment without regard to the case of Latin letters.
-bool EqualsNoCase(std::string_view a, std::string_view b);
-bool ContainsNoCase(std::string_view haystack, std::string_view needle);
 
 // The Hebrew abbreviation and the printed code of a currency code. Codes 10
 // to 18 take the company's own currency names from the company record.

@@ -1,5 +1,7 @@
 #include "forms/Companies.h"
 
+#include "platform/Ascii.h"
+
 #include "fixfiles/TextDecoding.h"
 #include "platform/Encoding.h"
 #include "platform/Error.h"
@@ -15,10 +17,6 @@ namespace dovrel {
 namespace fs = std::filesystem;
 
 namespace {
-
-bool IsLatinOrDigit(unsigned char c) {
-    return (c >= '0' && c <= '9') || (c >= 'A' && c <= 'Z') || (c >= 'a' && c <= 'z');
-}
 
 // The Unicode code point of every code page 1255 byte; a byte the code page
 // leaves undefined stands for itself.
@@ -94,7 +92,7 @@ bool IsHidden(const std::string& name) {
 
 // The visible subdirectories of root, in name order, as native names.
 std::vector<std::string> Subdirectories(const std::string& root) {
-    std::string native = ResolvePath(root);
+    std::string native = ResolvePath(PathFromCp1255(root)).native();
     std::error_code ec;
     fs::directory_iterator it(native, ec);
     if (ec)
@@ -153,7 +151,7 @@ std::string WAsc2Heb(std::string_view stored) {
         auto c = static_cast<unsigned char>(ch);
         if (c >= 0x80 && c <= 0x9A)
             before += static_cast<char>(c + 0x60);
-        else if (IsLatinOrDigit(c))
+        else if (IsAsciiAlnum(static_cast<char>(c)))
             after += ch;
         else
             before += ch;
@@ -186,7 +184,7 @@ std::string ListedName(const CompanyEntry& entry) {
 
 std::vector<CompanyEntry> FindCompanies(const std::string& root) {
     std::string main = WithSeparator(root);
-    fs::path nativeMain = ResolvePath(main);
+    fs::path nativeMain = ResolvePath(PathFromCp1255(main)).native();
     std::vector<CompanyEntry> table;
     for (const std::string& native : Subdirectories(main)) {
         std::string name = FromUtf8(native);

@@ -25,7 +25,7 @@ constexpr size_t kKeys = 4;
 
 void Items(const std::string& dir, CurrentDocument& doc, ProgressBar progress) {
     try {
-        ReadITM(dir, doc, progress);
+        ReadITM(Path(dir), doc, progress);
     } catch (const Error&) {
     }
     Require(progress.fill.Width() == 0, "the progress bar is empty after the items scan");
@@ -36,7 +36,7 @@ void Items(const std::string& dir, CurrentDocument& doc, ProgressBar progress) {
 void Accounts(const std::string& dir, const std::string& key, ProgressBar progress) {
     AccountsTable table;
     try {
-        ReadACT(dir, table, progress);
+        ReadACT(Path(dir), table, progress);
         Require(table.AccountsLoaded, "a finished scan marks the accounts loaded");
     } catch (const Error&) {
     }
@@ -54,7 +54,7 @@ void Accounts(const std::string& dir, const std::string& key, ProgressBar progre
 
 void Company(const std::string& dir) {
     CompanyRecord company;
-    bool read = ReadAdf(dir, company);
+    bool read = ReadAdf(Path(dir), company);
     Require(company.bytes.size() == kAdfRecordLength, "the company record keeps its length");
     Require(read || company.bytes == std::string(kAdfRecordLength, '\0'),
             "a failed read leaves the record as it was");

@@ -53,7 +53,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     const std::string path = fuzz::PrivateDir() + "/records";
     fuzz::WriteFile(path, bytes);
 
-    RecordFile file(path, length, blockSize);
+    RecordFile file(Path(path), length, blockSize);
     Require(file.length() == static_cast<int64_t>(bytes.size()), "the length is the file's");
     int64_t last = static_cast<int64_t>(bytes.size() / length);
     for (int64_t n : reads)

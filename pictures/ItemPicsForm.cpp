@@ -132,7 +132,7 @@ void ItemPicsForm::InitItemPicLines() {
 }
 
 int16_t ItemPicsForm::FillGridLines(const std::string& pDbName) {
-    if (!FileExists(pDbName))
+    if (!FileExists(PathFromCp1255(pDbName)))
         return 0;
     std::vector<PictureRange> ranges = PictureDb(pDbName).rangesById();
     if (ranges.size() > static_cast<size_t>(INT16_MAX))
@@ -165,7 +165,7 @@ void ItemPicsForm::SetGetMoreParams(uint8_t Action) {
 }
 
 bool ItemPicsForm::CheckDBFile() {
-    if (FileExists(settingDbName()))
+    if (FileExists(PathFromCp1255(settingDbName())))
         return true;
     messages().show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("שגיאה"),
                     FromUtf8("קובץ ההגדרות אינו נמצא"));
@@ -219,7 +219,7 @@ void ItemPicsForm::CmdDelete_Click() {
         return;
     std::string dbName = txtDBPath.Text() + PictureDb::kFileName;
     int32_t row = ItemPicLines.Row();
-    if (!FileExists(dbName) || row < ItemPicLines.FixedRows() || row < 1)
+    if (!FileExists(PathFromCp1255(dbName)) || row < ItemPicLines.FixedRows() || row < 1)
         return;
     if (!confirm("האם למחוק?"))
         return;

@@ -161,7 +161,7 @@ void RemoveIfThere(const std::string& fsPath, const std::string& failure) {
 PictureDb::PictureDb(std::string path) : path_(std::move(path)) {}
 
 PictureDb::Inspection PictureDb::inspect() const {
-    std::string fsPath = ResolvePath(path_);
+    std::string fsPath = ResolvePath(PathFromCp1255(path_)).native();
     struct stat info {};
     if (stat(fsPath.c_str(), &info) != 0) {
         if (errno == ENOENT || errno == ENOTDIR)
@@ -196,7 +196,7 @@ namespace {
 // before anything is read from or written to its tables.
 std::unique_ptr<Connection> OpenPictures(const std::string& path, bool write,
                                          std::chrono::milliseconds timeout, const char* doing) {
-    std::string fsPath = ResolvePath(path);
+    std::string fsPath = ResolvePath(PathFromCp1255(path)).native();
     std::string failure = std::string(doing) + " " + fsPath;
     struct stat info {};
     if (stat(fsPath.c_str(), &info) != 0)
@@ -248,10 +248,12 @@ void PictureDb::replaceAll(const std::vector<PictureRange>& ranges) const {
     const char* doing = "Cannot save the picture ranges to";
     for (size_t i = 0; i < ranges.size(); ++i)
         if (std::string problem = problemOf(ranges[i]); !problem.empty())
-            throw Error(std::string(doing) + " " + ResolvePath(path_) + ": row " +
-                        std::to_string(i + 1) + ": " + problem + "; nothing was changed");
+            throw Error(std::string(doing) + " " + ResolvePath(PathFromCp1255(path_)).shown() +
+                        ": row " + std::to_string(i + 1) + ": " + problem +
+                        "; nothing was changed");
     if (ranges.size() > static_cast<size_t>(INT32_MAX))
-        throw Error(std::string(doing) + " " + ResolvePath(path_) + ": too many ranges");
+        throw Error(std::string(doing) + " " + ResolvePath(PathFromCp1255(path_)).shown() +
+                    ": too many ranges");
     auto db = OpenPictures(path_, true, busyTimeout_, doing);
     db->exec("BEGIN IMMEDIATE");
     Statement upsert(*db, kUpsert);
@@ -270,7 +272,8 @@ void PictureDb::replaceAll(const std::vector<PictureRange>& ranges) const {
 int32_t PictureDb::add(PictureRange range) const {
     const char* doing = "Cannot add a picture range to";
     if (std::string problem = problemOf(range); !problem.empty())
-        throw Error(std::string(doing) + " " + ResolvePath(path_) + ": " + problem);
+        throw Error(std::string(doing) + " " + ResolvePath(PathFromCp1255(path_)).shown() + ": " +
+                    problem);
     auto db = OpenPictures(path_, true, busyTimeout_, doing);
     db->exec("BEGIN IMMEDIATE");
     Statement last(*db, "SELECT coalesce(max(RangeID), 0) FROM tItemPicture");
@@ -278,7 +281,8 @@ int32_t PictureDb::add(PictureRange range) const {
     int64_t highest = last.integer(0);
     last.reset();
     if (highest >= INT32_MAX)
-        throw Error(std::string(doing) + " " + ResolvePath(path_) + ": no range number is free");
+        throw Error(std::string(doing) + " " + ResolvePath(PathFromCp1255(path_)).shown() +
+                    ": no range number is free");
     int32_t rangeId = static_cast<int32_t>(std::max<int64_t>(highest, 0) + 1);
     Statement insert(*db, kUpsert);
     BindRange(insert, rangeId, range);
@@ -359,7 +363,7 @@ private:
 } // namespace
 
 void PictureDb::create(bool replaceForeign) const {
-    std::string fsPath = ResolvePath(path_);
+    std::string fsPath = ResolvePath(PathFromCp1255(path_)).native();
     std::string failure = "Cannot create the picture database " + fsPath;
     Inspection old = inspect();
     if (old.kind == FileKind::Foreign && !replaceForeign)

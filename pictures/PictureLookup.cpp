@@ -1,5 +1,7 @@
 #include "pictures/PictureLookup.h"
 
+#include "platform/Ascii.h"
+
 #include "fixfiles/CurrentDocument.h"
 #include "pictures/PictureCollation.h"
 #include "platform/Error.h"
@@ -16,13 +18,6 @@
 namespace dovrel {
 
 namespace {
-
-std::string_view TrimSpaces(std::string_view text) {
-    size_t first = text.find_first_not_of(' ');
-    if (first == std::string_view::npos)
-        return {};
-    return text.substr(first, text.find_last_not_of(' ') - first + 1);
-}
 
 // The order of two sort keys: their heads first, their bytes when the heads
 // are equal. Sort keys hold no zero bytes, so a head padded with zeros keeps
@@ -66,9 +61,9 @@ bool PictureLookup::contains(size_t range, const SortKey& key, const SortKey& co
 
 const std::string* PictureLookup::pictureFor(std::string_view itemKey,
                                              std::string_view catCode) const {
-    if (TrimSpaces(catCode).empty() || ranges_.empty())
+    if (Trim(catCode).empty() || ranges_.empty())
         return nullptr;
-    SortKey key = sortKeyOf(std::string(TrimSpaces(itemKey)));
+    SortKey key = sortKeyOf(std::string(Trim(itemKey)));
     SortKey code = sortKeyOf(std::string(catCode));
     for (size_t i = ranges_.size(); i-- > 0;) {
         if (!contains(i, key, code))
@@ -121,7 +116,7 @@ std::shared_ptr<const PictureLookup> LookupOf(const std::string& dbName) {
         std::shared_ptr<const PictureLookup> lookup;
     };
     thread_local Kept kept;
-    std::string fsPath = ResolvePath(dbName);
+    std::string fsPath = ResolvePath(PathFromCp1255(dbName)).native();
     std::optional<FileState> before = StateOf(fsPath);
     if (before && kept.lookup && kept.fsPath == fsPath && kept.state == *before)
         return kept.lookup;
@@ -137,7 +132,7 @@ std::shared_ptr<const PictureLookup> LookupOf(const std::string& dbName) {
 } // namespace
 
 void FillPictures(const std::string& dbName, CurrentDocument& doc) {
-    if (!FileExists(dbName))
+    if (!FileExists(PathFromCp1255(dbName)))
         return;
     std::shared_ptr<const PictureLookup> found = LookupOf(dbName);
     const PictureLookup& lookup = *found;

@@ -1,6 +1,5 @@
 #include "platform/Browser.h"
 
-#include "platform/Encoding.h"
 #include "platform/Error.h"
 
 #include <cstring>
@@ -13,9 +12,9 @@ extern char** environ;
 
 namespace dovrel {
 
-void XdgOpenBrowser::Open(const std::string& path) {
+void XdgOpenBrowser::Open(const Path& path) {
     std::string program = "xdg-open";
-    std::string argument = ToUtf8(path);
+    std::string argument = path.native();
     char* argv[] = {program.data(), argument.data(), nullptr};
     pid_t pid = 0;
     int error = posix_spawnp(&pid, program.c_str(), nullptr, nullptr, argv, environ);

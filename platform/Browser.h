@@ -1,5 +1,7 @@
 #pragma once
 
+#include "platform/Path.h"
+
 #include <string>
 #include <vector>
 
@@ -10,21 +12,21 @@ namespace dovrel {
 class Browser {
 public:
     virtual ~Browser() = default;
-    // The path is code page 1255, as every path the control holds.
-    virtual void Open(const std::string& path) = 0;
+    virtual void Open(const Path& path) = 0;
 };
 
 // The user's own browser, through xdg-open started directly (no shell); the
 // program is not waited for.
 class XdgOpenBrowser : public Browser {
 public:
-    void Open(const std::string& path) override;
+    void Open(const Path& path) override;
 };
 
 // Keeps the paths it was asked to open: for tests and the automation host.
 class RecordingBrowser : public Browser {
 public:
-    void Open(const std::string& path) override { opened.push_back(path); }
+    void Open(const Path& path) override { opened.push_back(path.native()); }
+    // The native bytes of each path.
     std::vector<std::string> opened;
 };
 

@@ -6,16 +6,26 @@
 namespace dovrel {
 
 // Inside the core every text is a string of single bytes in the Windows
-// Hebrew code page 1255. These two functions are the only place where text
+// Hebrew code page 1255. These functions are the only place where text
 // crosses to and from UTF-8 (command output, JSON, widgets, SQLite).
 
-// Code page 1255 bytes to UTF-8. Bytes the code page leaves undefined and
-// control bytes other than TAB, LF and CR become U+FFFD, so the result is
-// always valid UTF-8.
+// Code page 1255 bytes to UTF-8, without loss: every byte becomes its own
+// character. Control bytes stay the control characters they are; a byte the
+// code page leaves undefined becomes the character of the same number
+// (0x81 -> U+0081), which no defined byte uses. FromUtf8 undoes it exactly.
 std::string ToUtf8(std::string_view cp1255);
 
 // UTF-8 to code page 1255. A character the code page cannot hold, or a
 // malformed UTF-8 sequence, becomes "?".
 std::string FromUtf8(std::string_view utf8);
+
+// Code page 1255 bytes to UTF-8 for a terminal: as ToUtf8, but control
+// characters other than TAB, LF and CR become U+FFFD, so stored bytes
+// cannot move the cursor or change the terminal's state.
+std::string ToTerminal(std::string_view cp1255);
+
+// Bytes that should be UTF-8 (a file name, say) as valid UTF-8: each
+// malformed sequence becomes U+FFFD.
+std::string ValidUtf8(std::string_view bytes);
 
 } // namespace dovrel

@@ -1,6 +1,6 @@
 #include "platform/FileSystem.h"
 
-#include "platform/Encoding.h"
+#include "platform/Ascii.h"
 
 #include <dirent.h>
 #include <sys/stat.h>
@@ -9,13 +9,6 @@
 
 namespace dovrel {
 namespace {
-
-bool SameNoCase(std::string_view a, std::string_view b) {
-    return std::equal(a.begin(), a.end(), b.begin(), b.end(), [](char x, char y) {
-        auto lower = [](char c) { return c >= 'A' && c <= 'Z' ? static_cast<char>(c + 32) : c; };
-        return lower(x) == lower(y);
-    });
-}
 
 bool Exists(const std::string& path) {
     struct stat st;
@@ -33,7 +26,7 @@ std::string MatchInDirectory(const std::string& dir, const std::string& name) {
     std::string best;
     while (const dirent* entry = ::readdir(stream)) {
         std::string_view entryName = entry->d_name;
-        if (SameNoCase(entryName, name) && (best.empty() || entryName < best))
+        if (EqualsNoCase(entryName, name) && (best.empty() || entryName < best))
             best = entryName;
     }
     ::closedir(stream);
@@ -42,8 +35,8 @@ std::string MatchInDirectory(const std::string& dir, const std::string& name) {
 
 } // namespace
 
-std::string ResolvePath(std::string_view path) {
-    std::string native = ToUtf8(path);
+Path ResolvePath(const Path& path) {
+    std::string native = path.native();
     std::replace(native.begin(), native.end(), '\\', '/');
     std::string resolved = native.starts_with('/') ? "/" : "";
     bool matching = true; // stays true while every component so far exists
@@ -68,12 +61,12 @@ std::string ResolvePath(std::string_view path) {
         }
         resolved += component;
     }
-    return resolved;
+    return Path(resolved);
 }
 
-bool FileExists(std::string_view path) {
+bool FileExists(const Path& path) {
     struct stat st;
-    std::string resolved = ResolvePath(path);
+    Path resolved = ResolvePath(path);
     return !resolved.empty() && ::stat(resolved.c_str(), &st) == 0 && S_ISREG(st.st_mode);
 }
 

@@ -57,7 +57,8 @@ void DriveListBox::setDrive(const std::string& drive) {
 
 void DirListBox::setPath(const std::string& path) {
     std::error_code ec;
-    if (path.empty() || !std::filesystem::is_directory(ResolvePath(path), ec))
+    if (path.empty() ||
+        !std::filesystem::is_directory(ResolvePath(PathFromCp1255(path)).native(), ec))
         throw Error("Path not found: " + ToUtf8(path));
     if (path == path_)
         return;

@@ -1,5 +1,7 @@
 #include "platform/Messages.h"
 
+#include "platform/Encoding.h"
+
 #include <utility>
 
 namespace dovrel {
@@ -14,6 +16,10 @@ MsgAnswer RecordedMessages::show(MsgIcon icon, MsgButtons buttons, const std::st
     MsgAnswer answer = answers_.front();
     answers_.pop_front();
     return answer;
+}
+
+void ShowFailure(Messages& messages, const std::string& titleUtf8, const std::exception& failure) {
+    messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8(titleUtf8), FromUtf8(failure.what()));
 }
 
 std::vector<RecordedMessages::Shown> RecordedMessages::take() {

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <deque>
+#include <exception>
 #include <string>
 #include <vector>
 
@@ -17,6 +18,10 @@ public:
     virtual MsgAnswer show(MsgIcon icon, MsgButtons buttons, const std::string& title,
                            const std::string& text) = 0;
 };
+
+// Shows a failure under the title: the failure's description is UTF-8 text
+// (as every error's), turned here, and only here, into the box's code page.
+void ShowFailure(Messages& messages, const std::string& titleUtf8, const std::exception& failure);
 
 // A message box that nobody sees: it records every message and answers
 // questions from a queue (an empty queue answers "No"). Tests and the

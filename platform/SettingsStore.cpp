@@ -1,5 +1,7 @@
 #include "platform/SettingsStore.h"
 
+#include "platform/Ascii.h"
+
 #include "platform/Error.h"
 
 #include <algorithm>
@@ -17,11 +19,7 @@ std::optional<std::string> SettingsStore::FindSetting(const std::string& app,
 }
 
 std::string SettingsStore::FoldCase(std::string_view name) {
-    std::string folded(name);
-    for (char& c : folded)
-        if (c >= 'A' && c <= 'Z')
-            c = static_cast<char>(c - 'A' + 'a');
-    return folded;
+    return AsciiFold(name);
 }
 
 void SettingsStore::SortByKey(std::vector<Entry>& entries) {

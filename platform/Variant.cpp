@@ -1,27 +1,16 @@
 #include "platform/Variant.h"
 
+#include "platform/Ascii.h"
+
 #include "platform/Error.h"
 
-#include <cctype>
 #include <charconv>
 #include <cmath>
 #include <cstdint>
-#include <cstdio>
 
 namespace dovrel {
 
-namespace {
-
-bool EqualsIgnoringCase(const std::string& text, const char* word) {
-    size_t i = 0;
-    for (; i < text.size() && word[i] != '\0'; ++i)
-        if (std::tolower(static_cast<unsigned char>(text[i])) !=
-            std::tolower(static_cast<unsigned char>(word[i])))
-            return false;
-    return i == text.size() && word[i] == '\0';
-}
-
-} // namespace
+namespace {} // namespace
 
 Variant Variant::Null() {
     Variant v;
@@ -36,10 +25,11 @@ std::string PlainNumber(double value) {
         return "0";
     // Fifteen significant digits, as the classic basic conversion gives:
     // 0.1 + 0.2 shows as 0.3, not 0.30000000000000004.
+    // to_chars ignores the locale: the point is a point under every locale.
     char buf[40];
-    std::snprintf(buf, sizeof buf, "%.15G", value);
-    std::string s(buf);
-    auto e = s.find('E');
+    auto end = std::to_chars(buf, buf + sizeof buf, value, std::chars_format::general, 15).ptr;
+    std::string s(buf, end);
+    auto e = s.find('e');
     std::string mantissa = s.substr(0, e);
     std::string exponent = e == std::string::npos ? std::string() : s.substr(e);
     if (mantissa.find('.') != std::string::npos) {
@@ -89,12 +79,11 @@ double Variant::toNumber() const {
         break;
     }
     const std::string& text = std::get<std::string>(value_);
-    size_t first = text.find_first_not_of(' ');
-    size_t last = text.find_last_not_of(' ');
-    if (first == std::string::npos)
+    std::string_view trimmed = Trim(text);
+    if (trimmed.empty())
         throw Error("Type mismatch");
-    const char* begin = text.data() + first;
-    const char* end = text.data() + last + 1;
+    const char* begin = trimmed.data();
+    const char* end = trimmed.data() + trimmed.size();
     if (*begin == '+')
         ++begin;
     double number = 0;
@@ -130,9 +119,9 @@ bool Variant::toBool() const {
         return std::get<bool>(value_);
     if (kind() == Kind::Text) {
         const std::string& text = std::get<std::string>(value_);
-        if (EqualsIgnoringCase(text, "True"))
+        if (EqualsNoCase(text, "True"))
             return true;
-        if (EqualsIgnoringCase(text, "False"))
+        if (EqualsNoCase(text, "False"))
             return false;
     }
     return toNumber() != 0;

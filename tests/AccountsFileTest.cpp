@@ -51,7 +51,7 @@ TEST_F(AccountsFileTest, LoadsEveryAccountInFileOrderAndFindsTheFirstOfAKey) {
                             .dump());
     bool moved = false;
     fill.changed.connect([&] { moved = moved || fill.Width() > 0; });
-    ASSERT_TRUE(ReadACT(company.compPath(), table, progress));
+    ASSERT_TRUE(ReadACT(PathFromCp1255(company.compPath()), table, progress));
     EXPECT_EQ(table.AccountCount, 4);
     ASSERT_EQ(KeysOf(table), (Keys{"", "1001", "ab1", W("דן"), "1001"}));
     EXPECT_EQ(Fields(table.Accounts[1]), W("1001|03-1234567|מרכז|לקוח קבוע"));
@@ -68,14 +68,14 @@ TEST_F(AccountsFileTest, LoadsEveryAccountInFileOrderAndFindsTheFirstOfAKey) {
 
 TEST_F(AccountsFileTest, ANewReadReplacesTheTableAndAFailedOneLeavesIt) {
     TestCompany without(json{{"items", json::array()}}.dump());
-    EXPECT_THROW(ReadACT(without.compPath(), table, progress), Error);
+    EXPECT_THROW(ReadACT(PathFromCp1255(without.compPath()), table, progress), Error);
     EXPECT_FALSE(table.AccountsLoaded);
     TestCompany big(json{{"accounts", {Account("1"), Account("2"), Account("3")}}}.dump());
     TestCompany small(json{{"accounts", {Account("1001", "03")}}}.dump());
-    ASSERT_TRUE(ReadACT(big.compPath(), table, progress));
-    ASSERT_TRUE(ReadACT(small.compPath(), table, progress));
+    ASSERT_TRUE(ReadACT(PathFromCp1255(big.compPath()), table, progress));
+    ASSERT_TRUE(ReadACT(PathFromCp1255(small.compPath()), table, progress));
     fill.setWidth(100);
-    EXPECT_THAT([&] { ReadACT(without.compPath(), table, progress); },
+    EXPECT_THAT([&] { ReadACT(PathFromCp1255(without.compPath()), table, progress); },
                 testing::ThrowsMessage<Error>(testing::HasSubstr("ACT.fix")));
     EXPECT_EQ(table.AccountCount, 1);
     EXPECT_EQ(KeysOf(table), (Keys{"", "1001"}));
@@ -84,7 +84,7 @@ TEST_F(AccountsFileTest, ANewReadReplacesTheTableAndAFailedOneLeavesIt) {
     // Two records of 650 bytes hold no account to read.
     TestCompany tiny(json{{"accounts", {{"trailer", false}, {"list", {Account("5")}}}}}.dump());
     ASSERT_EQ(std::filesystem::file_size(tiny.file("ACT.fix")), 1300u);
-    EXPECT_TRUE(ReadACT(tiny.compPath(), table, progress));
+    EXPECT_TRUE(ReadACT(PathFromCp1255(tiny.compPath()), table, progress));
     EXPECT_EQ(std::pair(table.AccountCount, KeysOf(table)), std::pair(0, Keys{""}));
 }
 

@@ -4,6 +4,7 @@
 #include <nlohmann/json.hpp>
 
 #include <cstdlib>
+#include <filesystem>
 #include <sstream>
 #include <string>
 #include <tuple>
@@ -20,6 +21,30 @@ TEST(CliTest, ShowPrintsADocumentOfTheDemoCompany) {
     EXPECT_EQ(err, "");
     EXPECT_NE(out.find("(21)"), std::string::npos) << out;
     EXPECT_NE(out.find("סה\"כ כולל מע\"מ:"), std::string::npos) << out;
+}
+
+// Folder names that code page 1255 cannot hold reach the files as they are.
+TEST(CliTest, ShowAndPrintWorkInFoldersOfAnyName) {
+    test::TempDir temp;
+    std::filesystem::path company = temp.path() / "Документы" / "demo";
+    std::filesystem::create_directories(company.parent_path());
+    std::filesystem::copy(DOVREL_DEMO_DIR, company);
+    std::filesystem::path pages = temp.path() / "Временные";
+    std::filesystem::create_directories(pages);
+
+    auto shown = RunCli({"show", company.string(), "--type", "21", "--start", "2"});
+    EXPECT_EQ(shown.code, 0) << shown.err;
+    EXPECT_NE(shown.out.find("(21)"), std::string::npos) << shown.out;
+
+    const char* oldTmp = std::getenv("TMPDIR");
+    std::string saved = oldTmp ? oldTmp : "";
+    setenv("TMPDIR", pages.c_str(), 1);
+    auto printed = RunCli({"print", company.string(), "--type", "21", "--start", "2"});
+    oldTmp ? setenv("TMPDIR", saved.c_str(), 1) : unsetenv("TMPDIR");
+    ASSERT_EQ(printed.code, 0) << printed.err;
+    std::string page = printed.out.substr(0, printed.out.find('\n'));
+    EXPECT_EQ(page.rfind(pages.string(), 0), 0u) << page;
+    EXPECT_TRUE(std::filesystem::is_regular_file(page)) << page;
 }
 
 TEST(CliTest, HostAnswersOneLinePerRequest) {

@@ -29,7 +29,7 @@ TEST(CompanyFileTest, ReadsRecordOneWholeFromTheFileInAnyCase) {
         Company("דמו מחשבים בע\"מ", {{{"file", "adf.fix"}, {"append", "41 42 43"}}}).dump());
     std::filesystem::rename(company.file("adf.fix"), company.file("ADF.FIX"));
     CompanyRecord record;
-    ASSERT_TRUE(ReadAdf(company.compPath(), record));
+    ASSERT_TRUE(ReadAdf(PathFromCp1255(company.compPath()), record));
     std::ifstream in(company.file("ADF.FIX"), std::ios::binary);
     std::string stored{std::istreambuf_iterator<char>(in), {}};
     EXPECT_EQ(record.bytes, stored.substr(0, kAdfRecordLength));
@@ -43,17 +43,17 @@ TEST(CompanyFileTest, ReadsRecordOneWholeFromTheFileInAnyCase) {
 TEST(CompanyFileTest, AFailedReadKeepsWhatTheRecordHad) {
     CompanyRecord record;
     TestCompany without(json{{"items", json::array()}}.dump());
-    EXPECT_FALSE(ReadAdf(without.compPath(), record));
+    EXPECT_FALSE(ReadAdf(PathFromCp1255(without.compPath()), record));
     EXPECT_EQ(record.bytes, std::string(kAdfRecordLength, '\0'));
-    EXPECT_FALSE(ReadAdf(without.compPath() + "\\missing", record));
+    EXPECT_FALSE(ReadAdf(PathFromCp1255(without.compPath() + "\\missing"), record));
     TestCompany good(Company("Good").dump());
-    ASSERT_TRUE(ReadAdf(good.compPath(), record));
+    ASSERT_TRUE(ReadAdf(PathFromCp1255(good.compPath()), record));
     std::string kept = record.bytes;
     TestCompany truncated(Company("Short", {{{"file", "adf.fix"}, {"truncate", 1}}}).dump());
-    EXPECT_FALSE(ReadAdf(truncated.compPath(), record));
+    EXPECT_FALSE(ReadAdf(PathFromCp1255(truncated.compPath()), record));
     EXPECT_EQ(record.bytes, kept);
     std::filesystem::create_directory(without.file("adf.fix"));
-    EXPECT_FALSE(ReadAdf(without.compPath(), record));
+    EXPECT_FALSE(ReadAdf(PathFromCp1255(without.compPath()), record));
     EXPECT_EQ(record.bytes, kept);
 }
 

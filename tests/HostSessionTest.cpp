@@ -3,6 +3,7 @@
 #include "TestCompany.h"
 #include "app/cli/CardMembers.h"
 #include "app/cli/StateJson.h"
+#include "platform/Encoding.h"
 #include "platform/Error.h"
 
 #include <gtest/gtest.h>
@@ -95,6 +96,21 @@ TEST_F(HostSessionTest, SetAndGetRoundTripEachKind) {
     EXPECT_EQ(reply["state"]["controls"]["txtItemKey"], "מק\"ט 7");
     EXPECT_EQ(session.card().txtItemKey.Text(), test::W("מק\"ט 7"));
     EXPECT_EQ(ask({"get", "txtItemKey"})["value"], "מק\"ט 7");
+}
+
+// Every byte of the code page is its own character in the JSON, control
+// characters included, and comes back as the same byte.
+TEST_F(HostSessionTest, TextCrossesTheJsonWithoutLoss) {
+    EXPECT_EQ(ask({"get", "CompanyTitle"})["value"], std::string(60, '\0'));
+    std::string bytes;
+    for (int b = 1; b < 256; ++b)
+        bytes.push_back(static_cast<char>(b));
+    std::string text = ToUtf8(bytes);
+    ask({"set", "PubSearchValue", text});
+    json back = ask({"get", "PubSearchValue"})["value"];
+    EXPECT_EQ(back, text);
+    EXPECT_EQ(FromUtf8(back.get<std::string>()), bytes);
+    EXPECT_EQ(back.get<std::string>().find("\xEF\xBF\xBD"), std::string::npos) << "no U+FFFD";
 }
 
 TEST(CardMembersTest, ListsAndCheckBoxesTakeWholeNumbersInTheirRange) {

@@ -69,7 +69,7 @@ TEST_F(ItemsFileTest, OnlyRecordsBetweenTheFirstAndTheLastAreRead) {
     TestCompany two(Items({Item("A1", "09", "Other")}, false));
     CurrentDocument doc = DocumentWithKeys({"A1", "A2"});
     for (const TestCompany* company : {&three, &two}) {
-        EXPECT_TRUE(ReadITM(company->compPath(), doc, progress));
+        EXPECT_TRUE(ReadITM(PathFromCp1255(company->compPath()), doc, progress));
         EXPECT_EQ(LineFields(doc), (Texts{"01 |First", "   |"}));
     }
     EXPECT_EQ(std::filesystem::file_size(two.file("ITM.fix")), 1000u);
@@ -86,12 +86,12 @@ TEST_F(ItemsFileTest, FillsTheFirstLineOfAKeyFromItsLastRecordAsStored) {
     CurrentDocument doc = DocumentWithKeys(
         {"X", "B7", "C3", "", "B7", "aB12", test::W("שלום"), "  q9", "ab13", "K1", "K1"});
     doc.lines[4].foreignName = "kept";
-    ASSERT_TRUE(ReadITM(company.compPath(), doc, progress));
+    ASSERT_TRUE(ReadITM(PathFromCp1255(company.compPath()), doc, progress));
     EXPECT_EQ(LineFields(doc),
               (Texts{"   |", "9  |Spare part", "\x80\x41 |\x80\x81", "   |kept", "   |",
                      "02 |Mixed", "01 |Peace", "03 |Spaced", "   |", "05 |Newer", "   |"}));
     doc.lineCount = 1000; // held to the forty entries
-    EXPECT_TRUE(ReadITM(company.compPath(), doc, progress));
+    EXPECT_TRUE(ReadITM(PathFromCp1255(company.compPath()), doc, progress));
 }
 
 TEST_F(ItemsFileTest, ProgressMovesDuringALongScanAndEndsEmpty) {
@@ -100,7 +100,7 @@ TEST_F(ItemsFileTest, ProgressMovesDuringALongScanAndEndsEmpty) {
     fill.setWidth(700);
     std::vector<int32_t> widths;
     fill.changed.connect([&] { widths.push_back(fill.Width()); });
-    ASSERT_TRUE(ReadITM(company.compPath(), doc, progress));
+    ASSERT_TRUE(ReadITM(PathFromCp1255(company.compPath()), doc, progress));
     EXPECT_EQ(doc.lines[1].foreignName, "Item 199");
     // 202 records: the bar is emptied, moves at records 5, 10, ... 200 of the 201 read,
     // to 3015 * n / 201 = 15 * n twips, and is emptied at the end.
@@ -115,10 +115,10 @@ TEST_F(ItemsFileTest, AMissingFileIsAnErrorThatTouchesNothing) {
     CurrentDocument doc = DocumentWithKeys({"A1"});
     doc.lines[1].catCode = "abc";
     fill.setWidth(500);
-    EXPECT_THAT([&] { ReadITM(company.compPath(), doc, progress); },
+    EXPECT_THAT([&] { ReadITM(PathFromCp1255(company.compPath()), doc, progress); },
                 testing::ThrowsMessage<Error>(testing::HasSubstr("ITM.fix")));
     std::filesystem::create_directory(company.file("ITM.fix"));
-    EXPECT_THROW(ReadITM(company.compPath(), doc, progress), Error);
+    EXPECT_THROW(ReadITM(PathFromCp1255(company.compPath()), doc, progress), Error);
     EXPECT_EQ(std::pair(doc.lines[1].catCode, fill.Width()), std::pair(std::string("abc"), 500));
 }
 
@@ -130,7 +130,7 @@ TEST_F(ItemsFileTest, AFileThatShrinksDuringTheScanEndsItWithWhatWasRead) {
         if (fill.Width() > 0 && !std::exchange(cut, true))
             std::filesystem::resize_file(company.file("ITM.fix"), 300 * 500);
     });
-    EXPECT_TRUE(ReadITM(company.compPath(), doc, progress));
+    EXPECT_TRUE(ReadITM(PathFromCp1255(company.compPath()), doc, progress));
     EXPECT_EQ(LineFields(doc), (Texts{"01 |Item 3", "   |"}));
 }
 

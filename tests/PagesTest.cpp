@@ -238,7 +238,7 @@ TEST_F(PagesTest, EnglishPageComputesItsTotalsAndTakesForeignNames) {
     docs[0]["lines"].push_back(Line("B200", "אפס", 3, 0));
     show(docs);
     std::string compDir = company->compPath();
-    ReadAdf(compDir, state.Company);
+    ReadAdf(PathFromCp1255(compDir), state.Company);
     card->ReadITM(compDir);
     card->ChkShowDetails.setValue(0);
     std::vector<std::string> page = english(true);
@@ -342,7 +342,7 @@ TEST_F(PagesTest, WriteCellWritesOnlyIntoThePageBeingBuilt) {
 
 TEST_F(PagesTest, PrintWritesThePrivatePageAndOpensItOrSaysWhatFailed) {
     show(Delivery());
-    fs::path dir = PrivatePageDir();
+    fs::path dir = PrivatePageDir().native();
     fs::path page = dir / "dvprint.htm";
 
     card->CmbDocLang.setListIndex(-1);
@@ -396,7 +396,7 @@ TEST_F(PagesTest, ThePageFolderMustBeTheUsersOwn) {
     fs::remove(dir);
     fs::create_directory(dir);
     fs::permissions(dir, fs::perms::owner_all | fs::perms::group_read | fs::perms::others_read);
-    EXPECT_EQ(PrintFilePath(), (dir / "dvprint.htm").string());
+    EXPECT_EQ(PrintFilePath().native(), (dir / "dvprint.htm").string());
     EXPECT_EQ(fs::status(dir).permissions() & fs::perms::all, fs::perms::owner_all);
     fs::remove(dir);
     fs::create_directory(temp.path() / "elsewhere");

@@ -25,7 +25,7 @@ TEST(RecordFileTest, ReadsRecordsForwardAndBackwardAcrossBlocks) {
     test::TempDir dir;
     fs::path path = dir.path() / "DATA.FIX";
     WriteNumbered(path, 100, 7, 3);
-    RecordFile file(path.string(), 7, 50); // blocks of 50 bytes: records straddle them
+    RecordFile file(Path(path.string()), 7, 50); // blocks of 50 bytes: records straddle them
     EXPECT_EQ(file.length(), 703);
     for (int i = 1; i <= 200; ++i) {
         int r = i <= 100 ? i : 201 - i; // forward, then backward
@@ -43,7 +43,7 @@ TEST(RecordFileTest, AFileThatShrinksWhileReadIsReadAsItIsNow) {
     test::TempDir dir;
     fs::path path = dir.path() / "DATA.FIX";
     WriteNumbered(path, 1000, 10);
-    RecordFile file(path.string(), 10, 100);
+    RecordFile file(Path(path.string()), 10, 100);
     ASSERT_NE(file.record(50), nullptr); // the blocks of records 50 to 59
     ASSERT_NE(file.record(1), nullptr);  // and 1 to 10 are kept
     fs::resize_file(path, 55);           // five and a half records left
@@ -59,12 +59,12 @@ TEST(RecordFileTest, AFileThatShrinksWhileReadIsReadAsItIsNow) {
 
 TEST(RecordFileTest, RefusesWhatIsNotARegularFile) {
     test::TempDir dir;
-    EXPECT_THROW(RecordFile((dir.path() / "missing").string(), 10), Error);
-    EXPECT_THROW(RecordFile(dir.str(), 10), Error);
+    EXPECT_THROW(RecordFile(Path((dir.path() / "missing").string()), 10), Error);
+    EXPECT_THROW(RecordFile(Path(dir.str()), 10), Error);
     fs::path fifo = dir.path() / "PIPE.FIX";
     ASSERT_EQ(::mkfifo(fifo.c_str(), 0600), 0);
     // Must not wait for a writer.
-    EXPECT_THAT([&] { RecordFile(fifo.string(), 10); },
+    EXPECT_THAT([&] { RecordFile(Path(fifo.string()), 10); },
                 testing::ThrowsMessage<Error>(testing::HasSubstr("not a regular file")));
 }
 
@@ -83,9 +83,10 @@ TEST(FileSystemTest, ResolvesDosPathsWithoutRegardToCase) {
                                        {"\\COMP02", false},
                                        {"\\COMP02\\ACT.fix", false},
                                        {"\\חברה\\ISHP.FIX", true}})
-        EXPECT_EQ(FileExists(base + FromUtf8(path)), exists) << path;
-    EXPECT_FALSE(FileExists(""));
-    EXPECT_EQ(ResolvePath(base + "\\nothing\\ITM.fix"), dir.str() + "/nothing/ITM.fix");
+        EXPECT_EQ(FileExists(PathFromCp1255(base + FromUtf8(path))), exists) << path;
+    EXPECT_FALSE(FileExists(Path()));
+    EXPECT_EQ(ResolvePath(PathFromCp1255(base + "\\nothing\\ITM.fix")).native(),
+              dir.str() + "/nothing/ITM.fix");
 
     // Two names that differ only in case: the exact one wins, else the first in order.
     std::ofstream(dir.path() / "Comp02" / "itm.fix") << "y";
@@ -93,7 +94,7 @@ TEST(FileSystemTest, ResolvesDosPathsWithoutRegardToCase) {
                                          {"/COMP02/ADF.FIX", "/Comp02/adf.fix"},
                                          {"/Comp02/itm.fix", "/Comp02/itm.fix"},
                                          {"/Comp02/Itm.Fix", "/Comp02/ITM.FIX"}})
-        EXPECT_EQ(ResolvePath(base + path), dir.str() + resolved) << path;
+        EXPECT_EQ(ResolvePath(PathFromCp1255(base + path)).native(), dir.str() + resolved) << path;
 }
 
 } // namespace

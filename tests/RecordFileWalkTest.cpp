@@ -18,7 +18,7 @@ TEST(RecordFileWalkTest, BackwardWalksThatLookAheadReadEveryRecordRight) {
     std::filesystem::path path = dir.path() / "DATA.FIX";
     test::WriteNumbered(path, 300, 7);
     for (size_t blockSize : {7, 20, 50, 64, 1000}) {
-        RecordFile file(path.string(), 7, blockSize);
+        RecordFile file(Path(path.string()), 7, blockSize);
         for (int r = 300; r >= 1; --r) {
             // As a header at r: its continuation and a few lines after it.
             for (int ahead = r; ahead <= std::min(300, r + (r % 5)); ++ahead) {

@@ -3,10 +3,12 @@
 #include "TestCompany.h"
 #include "app/cli/HostSession.h"
 #include "platform/Error.h"
+#include "platform/Variant.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <locale>
 #include <sstream>
 #include <tuple>
 #include <utility>
@@ -48,6 +50,39 @@ size_t ColumnOf(const std::string& text, const std::string& word) {
             return ShowCommand::DisplayWidth(line.substr(0, at));
     ADD_FAILURE() << word << " is not shown";
     return std::string::npos;
+}
+
+// A decimal comma for the whole process: the German locale when it is
+// installed (it reaches printf too), else a facet of our own.
+struct CommaLocale {
+    std::locale saved = std::locale();
+    CommaLocale() {
+        struct Comma : std::numpunct<char> {
+            char do_decimal_point() const override { return ','; }
+        };
+        try {
+            std::locale::global(std::locale("de_DE.UTF-8"));
+        } catch (const std::runtime_error&) {
+            std::locale::global(std::locale(std::locale::classic(), new Comma));
+        }
+        std::ostringstream probe;
+        probe << 1.5;
+        EXPECT_EQ(probe.str(), "1,5") << "the locale must format with a comma";
+    }
+    ~CommaLocale() { std::locale::global(saved); }
+};
+
+TEST(ShowCommandTest, NumbersReadWithAPointUnderAnyLocale) {
+    test::TestCompany company(kCompany);
+    CommaLocale comma;
+    Output shown = Show({company.path().string(), 20, 2, false});
+    ASSERT_EQ(shown.code, 0) << shown.err;
+    EXPECT_THAT(shown.out, HasSubstr("10.50"));
+    EXPECT_THAT(shown.out, ContainsRegex("\\b1\\.5\\b"));
+    EXPECT_THAT(shown.out, HasSubstr("213.78"));
+    Output json = Show({company.path().string(), 20, 2, true});
+    EXPECT_THAT(json.out, Not(HasSubstr("1,5")));
+    EXPECT_EQ(Variant(1.5).toText(), "1.5");
 }
 
 TEST(ShowCommandTest, PrintsTheFirstDocumentOfTheTypeFromTheStartRecordOrItsState) {

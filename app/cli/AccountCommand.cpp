@@ -20,7 +20,7 @@ int AccountCommand::run(std::ostream& out) {
     Shape frame("ProgressFrame", 0, 0, 1000, 100);
     Shape fill("ProgressFill", 0, 0, 0, 100);
     AccountsTable table;
-    ReadACT(FromUtf8(options_.compDir), table, {frame, fill});
+    ReadACT(Path(options_.compDir), table, {frame, fill});
     AccountEntry account = FindAccount(table, key);
     if (options_.json) {
         nlohmann::json answer = {{"key", ToUtf8(key)},
@@ -31,9 +31,9 @@ int AccountCommand::run(std::ostream& out) {
         out << StateJson::Dump(answer, 2) << '\n';
         return 0;
     }
-    out << "טלפונים: " << ToUtf8(account.Phone) << '\n'
-        << "פרטים: " << ToUtf8(account.Details) << '\n'
-        << "שכונה: " << ToUtf8(account.District) << '\n';
+    out << "טלפונים: " << ToTerminal(account.Phone) << '\n'
+        << "פרטים: " << ToTerminal(account.Details) << '\n'
+        << "שכונה: " << ToTerminal(account.District) << '\n';
     return 0;
 }
 

@@ -28,7 +28,7 @@ int CompaniesCommand::run(std::ostream& out, std::ostream& err) {
         if (options_.json)
             list.push_back({{"name", ToUtf8(name)}, {"path", ToUtf8(entry.path)}});
         else
-            out << ToUtf8(name) << '\t' << ToUtf8(entry.path) << '\n';
+            out << ToTerminal(name) << '\t' << ToTerminal(entry.path) << '\n';
     }
     if (options_.json)
         out << StateJson::Dump(list, 2) << '\n';

@@ -7,6 +7,7 @@
 #include "fixfiles/CompanyFile.h"
 #include "fixfiles/TextDecoding.h"
 #include "forms/FormDesigns.h"
+#include "platform/Encoding.h"
 #include "platform/Error.h"
 
 #include <istream>
@@ -95,7 +96,7 @@ std::optional<std::string> HostSession::handle(std::string_view line) {
     if (!browser_.opened.empty()) {
         reply["opened"] = json::array();
         for (const std::string& path : browser_.opened)
-            reply["opened"].push_back(StateJson::Text(path));
+            reply["opened"].push_back(ValidUtf8(path));
         browser_.opened.clear();
     }
     return StateJson::Dump(reply);
@@ -271,7 +272,8 @@ void HostSession::addFileCommands() {
     addCommand("ReadAdf", [](HostSession& session, const HostArgs& args) {
         args.expectCount(1);
         return json{
-            {"result", ReadAdf(args.text(0, "company path"), session.card().shared().Company)}};
+            {"result", ReadAdf(session.card().shared().Paths.native(args.text(0, "company path")),
+                               session.card().shared().Company)}};
     });
     addCommand("CurrencyNames", [](HostSession& session, const HostArgs& args) {
         args.expectCount(1);

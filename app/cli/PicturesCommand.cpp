@@ -118,8 +118,8 @@ int PicturesCommand::run(std::ostream& out, std::ostream& err) {
     const std::string& action = options_.action;
     if (action == "init")
         return init(db, out);
-    if (action != "import" && !FileExists(name)) {
-        err << "There is no picture database at " << ResolvePath(name)
+    if (action != "import" && !FileExists(PathFromCp1255(name))) {
+        err << "There is no picture database at " << ResolvePath(PathFromCp1255(name)).shown()
             << " (dovrel pictures init makes one)\n";
         return 1;
     }
@@ -146,10 +146,12 @@ void PicturesCommand::needArgs(size_t count, const char* usage) const {
 int PicturesCommand::init(const PictureDb& db, std::ostream& out) {
     PictureDb::Inspection old = db.inspect();
     if (old.kind == PictureDb::FileKind::Foreign && !options_.force)
-        throw Error("The file " + ResolvePath(db.path()) + " is not a picture database (" +
-                    old.reason + "); it was left as it is. Give --force to replace it");
+        throw Error("The file " + ResolvePath(PathFromCp1255(db.path())).shown() +
+                    " is not a picture database (" + old.reason +
+                    "); it was left as it is. Give --force to replace it");
     db.create(options_.force);
-    out << "Created an empty picture database at " << ResolvePath(db.path()) << '\n';
+    out << "Created an empty picture database at " << ResolvePath(PathFromCp1255(db.path())).shown()
+        << '\n';
     return 0;
 }
 
@@ -172,7 +174,7 @@ int PicturesCommand::list(const PictureDb& db, std::ostream& out) const {
     for (const PictureRange& range : ranges) {
         out << range.RangeID;
         for (auto member : kMembers)
-            out << '\t' << ToUtf8((range.*member).value_or(""));
+            out << '\t' << ToTerminal((range.*member).value_or(""));
         out << '\n';
     }
     return 0;
@@ -194,7 +196,8 @@ int PicturesCommand::remove(const PictureDb& db, std::ostream& err) const {
     int32_t rangeId = ParseRangeId(options_.args[0]);
     if (db.remove(rangeId))
         return 0;
-    err << "No range " << rangeId << " in " << ResolvePath(db.path()) << '\n';
+    err << "No range " << rangeId << " in " << ResolvePath(PathFromCp1255(db.path())).shown()
+        << '\n';
     return 1;
 }
 
@@ -206,7 +209,7 @@ int PicturesCommand::which(const PictureDb& db, std::ostream& out, std::ostream&
     code.resize(PictureDb::kCodeSize, ' ');
     PictureLookup lookup(db.rangesInLookupOrder());
     if (const std::string* picture = lookup.pictureFor(key, code)) {
-        out << ToUtf8(*picture) << '\n';
+        out << ToTerminal(*picture) << '\n';
         return 0;
     }
     err << "No picture for item " << options_.args[0] << " with category code \""

@@ -1,5 +1,7 @@
 #include "app/cli/PrintCommand.h"
 
+#include "platform/Ascii.h"
+
 #include "control/Card.h"
 #include "fixfiles/DocTypes.h"
 #include "fixfiles/TextDecoding.h"
@@ -55,8 +57,7 @@ CivilDate PrintCommand::ParseDay(const std::string& text) {
 std::string PrintCommand::PageName(const std::string& reference) {
     std::string name;
     for (char c : Trim(reference)) {
-        bool plain = (c >= '0' && c <= '9') || (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') ||
-                     c == '-' || c == '_';
+        bool plain = IsAsciiAlnum(c) || c == '-' || c == '_';
         name += plain ? c : '_';
     }
     return name.empty() ? "document" : name;
@@ -65,9 +66,9 @@ std::string PrintCommand::PageName(const std::string& reference) {
 int PrintCommand::run(std::ostream& out, std::ostream& err) {
     if (options_.count < 1)
         throw Error("The count must be 1 or more");
-    std::string compPath = FromUtf8(options_.compDir);
+    std::string compPath = shared_.Paths.text(Path(options_.compDir));
     std::error_code ec;
-    if (!fs::is_directory(ResolvePath(compPath), ec))
+    if (!fs::is_directory(ResolvePath(Path(options_.compDir)).native(), ec))
         throw Error("Company directory not found: " + options_.compDir);
     bool several = options_.count > 1;
     if (several && (options_.out.empty() || !fs::is_directory(options_.out, ec)))
@@ -93,7 +94,8 @@ int PrintCommand::run(std::ostream& out, std::ostream& err) {
     auto report = [&messages, &err] {
         bool any = false;
         for (const auto& message : messages.take()) {
-            err << "dovrel: " << ToUtf8(message.title) << ": " << ToUtf8(message.text) << '\n';
+            err << "dovrel: " << ToTerminal(message.title) << ": " << ToTerminal(message.text)
+                << '\n';
             any = true;
         }
         return any;
@@ -107,9 +109,9 @@ int PrintCommand::run(std::ostream& out, std::ostream& err) {
     }
 
     if (!several) {
-        std::string path = options_.out.empty() ? PrintFilePath() : FromUtf8(options_.out);
+        Path path = options_.out.empty() ? PrintFilePath() : Path(options_.out);
         card.WritePage(path);
-        out << ToUtf8(path) << '\n';
+        out << path.shown() << '\n';
         if (options_.open)
             browser_.Open(path);
         return 0;
@@ -120,7 +122,7 @@ int PrintCommand::run(std::ostream& out, std::ostream& err) {
     int32_t row = card.cmbDocType.ListIndex();
     while (true) {
         std::string path = names.next(card.txtReference1.Text());
-        card.WritePage(FromUtf8(path));
+        card.WritePage(Path(path));
         out << path << '\n' << std::flush;
         if (++written == options_.count)
             break;

@@ -32,7 +32,7 @@ int SettingsCommand::run(std::ostream& out, std::ostream& err) {
 
 int SettingsCommand::list(std::ostream& out) {
     for (const auto& [key, value] : store_.ListSettings(app_, kSection))
-        out << ToUtf8(key) << '=' << ToUtf8(value) << '\n';
+        out << ToTerminal(key) << '=' << ToTerminal(value) << '\n';
     return 0;
 }
 
@@ -40,7 +40,7 @@ int SettingsCommand::get(std::ostream& out, std::ostream& err) {
     std::optional<std::string> value = store_.FindSetting(app_, kSection, key_);
     if (!value)
         return noSetting(err);
-    out << ToUtf8(*value) << '\n';
+    out << ToTerminal(*value) << '\n';
     return 0;
 }
 
@@ -49,7 +49,7 @@ int SettingsCommand::unset(std::ostream& err) {
 }
 
 int SettingsCommand::noSetting(std::ostream& err) const {
-    err << "No setting \"" << ToUtf8(key_) << "\" under " << ToUtf8(app_) << '\n';
+    err << "No setting \"" << ToTerminal(key_) << "\" under " << ToTerminal(app_) << '\n';
     return 1;
 }
 

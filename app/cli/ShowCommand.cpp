@@ -43,7 +43,7 @@ void PrintFields(const std::vector<Field>& fields, std::ostream& out) {
 }
 
 std::string Utf8Trimmed(std::string_view cp1255) {
-    return ToUtf8(TrimCopy(cp1255));
+    return ToTerminal(TrimCopy(cp1255));
 }
 
 } // namespace
@@ -60,10 +60,11 @@ size_t ShowCommand::DisplayWidth(std::string_view utf8) {
 int ShowCommand::run(std::ostream& out, std::ostream& err) {
     if (options_.start < 1)
         throw Error("The start record must be 1 or more");
-    compPath_ = FromUtf8(options_.compDir);
+    Path compDir(options_.compDir);
+    compPath_ = shared_.Paths.text(compDir);
     std::error_code ec;
-    if (!std::filesystem::is_directory(ResolvePath(compPath_), ec))
-        throw Error("Company directory not found: " + options_.compDir);
+    if (!std::filesystem::is_directory(ResolvePath(compDir).native(), ec))
+        throw Error("Company directory not found: " + compDir.shown());
     RecordedMessages messages;
     Card card(messages, shared_);
     watchProgress(card);
@@ -75,7 +76,7 @@ int ShowCommand::run(std::ostream& out, std::ostream& err) {
     if (options_.json)
         out << StateJson::Dump(StateJson::Build(card), 2) << '\n';
     for (const auto& message : shown)
-        err << "dovrel: " << ToUtf8(message.title) << ": " << ToUtf8(message.text) << '\n';
+        err << "dovrel: " << ToTerminal(message.title) << ": " << ToTerminal(message.text) << '\n';
     if (!shown.empty())
         return 1;
     if (!options_.json)
@@ -88,7 +89,7 @@ int ShowCommand::run(std::ostream& out, std::ostream& err) {
 // its defaults: what the user saved is neither read nor changed.
 void ShowCommand::read(Card& card) {
     card.UserControl_InitProperties(nullptr);
-    companyRead_ = ReadAdf(compPath_, shared_.Company);
+    companyRead_ = ReadAdf(shared_.Paths.native(compPath_), shared_.Company);
     row_ = DocTypeIndex(shared_.DocTypes, options_.type);
     int16_t type = options_.type;
     int32_t start = options_.start;
@@ -131,14 +132,14 @@ void ShowCommand::printHeader(Card& card, std::ostream& out) const {
     }
     const DocTypeRow& type = shared_.DocTypes[static_cast<size_t>(row_)];
     std::vector<Field> fields = {
-        {"סוג מסמך", ToUtf8(type.hebrewTitle) + " (" + std::to_string(type.code) + ")"},
-        {"אסמכתא", ToUtf8(card.txtReference1.Text())},
-        {"תאריך", ToUtf8(card.txtDate.Text())},
-        {"כרטיס", ToUtf8(card.txtAccountKey.Text())},
-        {"שם", ToUtf8(card.txtCustomerName.Text())},
-        {"כתובת", ToUtf8(card.txtAddress1.Text())}};
+        {"סוג מסמך", ToTerminal(type.hebrewTitle) + " (" + std::to_string(type.code) + ")"},
+        {"אסמכתא", ToTerminal(card.txtReference1.Text())},
+        {"תאריך", ToTerminal(card.txtDate.Text())},
+        {"כרטיס", ToTerminal(card.txtAccountKey.Text())},
+        {"שם", ToTerminal(card.txtCustomerName.Text())},
+        {"כתובת", ToTerminal(card.txtAddress1.Text())}};
     if (!card.txtAddress2.Text().empty())
-        fields.push_back({"", ToUtf8(card.txtAddress2.Text())});
+        fields.push_back({"", ToTerminal(card.txtAddress2.Text())});
     PrintFields(fields, out);
 }
 
@@ -173,9 +174,9 @@ void ShowCommand::printLines(const Grid& grid, std::ostream& out) const {
 }
 
 void ShowCommand::printTotals(Card& card, std::ostream& out) const {
-    PrintFields({{"סה\"כ", ToUtf8(card.txtTotalVat.Text())},
-                 {"מע\"מ", ToUtf8(card.txtVatValue.Text())},
-                 {"סה\"כ כולל מע\"מ", ToUtf8(card.txtTotal1.Text())}},
+    PrintFields({{"סה\"כ", ToTerminal(card.txtTotalVat.Text())},
+                 {"מע\"מ", ToTerminal(card.txtVatValue.Text())},
+                 {"סה\"כ כולל מע\"מ", ToTerminal(card.txtTotal1.Text())}},
                 out);
 }
 

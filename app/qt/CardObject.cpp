@@ -20,7 +20,7 @@ QVariant CardObject::invoke(const char* name, const QVariantList& args) {
         widget_.call([&] { result = CardInterface::Invoke(widget_.card(), name, values); });
         return ToQVariant(result);
     } catch (const std::exception& failure) {
-        lastError_ = ToQString(failure.what());
+        lastError_ = QString::fromUtf8(failure.what());
         emit failed(lastError_);
         return QVariant();
     }

@@ -128,8 +128,7 @@ void CardWidget::runForUser(const std::function<void()>& step) {
 }
 
 void CardWidget::reportFailure(const std::exception& failure) {
-    card_->services().messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("תקלה"),
-                                    failure.what());
+    ShowFailure(card_->services().messages, "תקלה", failure);
 }
 
 } // namespace dovrel

@@ -8,6 +8,7 @@
 #include <QCheckBox>
 #include <QComboBox>
 #include <QEvent>
+#include <QFile>
 #include <QFileSystemModel>
 #include <QFocusEvent>
 #include <QFrame>
@@ -268,7 +269,8 @@ QWidget* ControlBinder::makeDirList(Control& control) {
         view->hideColumn(column);
     view->setHeaderHidden(true);
     follow(tree.changed, [view, files, &tree, this] {
-        QModelIndex index = files->index(QString::fromStdString(ResolvePath(tree.Path())));
+        const std::string native = ResolvePath(PathFromCp1255(tree.Path())).native();
+        QModelIndex index = files->index(QFile::decodeName(QByteArray::fromStdString(native)));
         if (!index.isValid() || index == view->currentIndex())
             return;
         ++syncing_;

@@ -80,7 +80,7 @@ void FormDialog::run(const std::function<void()>& step) {
     try {
         step();
     } catch (const std::exception& failure) {
-        messages_.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("תקלה"), failure.what());
+        ShowFailure(messages_, "תקלה", failure);
     }
     binder_->refresh();
     closeIfHidden();

@@ -5,6 +5,7 @@
 #include "platform/FileSystem.h"
 
 #include <QDesktopServices>
+#include <QFile>
 #include <QFileInfo>
 
 namespace dovrel {
@@ -23,10 +24,12 @@ void QtBrowser::setOpener(Opener opener) {
     opener_ = opener ? std::move(opener) : Opener(OpenWithDesktop);
 }
 
-// The path is the core's file name; the browser gets it as a local file
-// address, which escapes spaces and Hebrew letters properly.
-void QtBrowser::Open(const std::string& path) {
-    QString local = QString::fromStdString(ResolvePath(path));
+// The browser gets the path as a local file address, which escapes spaces
+// and letters of any script properly.
+void QtBrowser::Open(const Path& path) {
+    const std::string& native = ResolvePath(path).native();
+    QString local =
+        QFile::decodeName(QByteArray(native.data(), static_cast<qsizetype>(native.size())));
     QUrl url = QUrl::fromLocalFile(QFileInfo(local).absoluteFilePath());
     if (!opener_(url))
         throw Error("The browser could not be started for " + FromQString(url.toString()));

@@ -18,7 +18,7 @@ public:
     QtBrowser();
     void setOpener(Opener opener);
 
-    void Open(const std::string& path) override;
+    void Open(const Path& path) override;
 
 private:
     Opener opener_;

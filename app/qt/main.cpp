@@ -12,9 +12,11 @@
 #include "app/qt/ViewerOptions.h"
 #include "platform/Clock.h"
 #include "platform/Encoding.h"
+#include "platform/Path.h"
 #include "platform/SettingsStore.h"
 
 #include <QApplication>
+#include <QFile>
 #include <QMainWindow>
 
 #include <iostream>
@@ -27,7 +29,7 @@ int main(int argc, char* argv[]) {
     try {
         options = dovrel::ViewerOptions::Parse(QApplication::arguments());
     } catch (const std::exception& e) {
-        std::cerr << "dovrel-viewer: " << dovrel::ToUtf8(e.what()) << '\n';
+        std::cerr << "dovrel-viewer: " << e.what() << '\n';
         return 2;
     }
     if (options.help) {
@@ -55,8 +57,12 @@ int main(int argc, char* argv[]) {
     CardObject control(*card);
     card->runForUser([&] { card->card().UserControl_InitProperties(nullptr); });
     window.show();
-    if (!options.compDir.isEmpty())
-        control.ShowDoc(options.compDir, static_cast<short>(options.type), options.start);
+    if (!options.compDir.isEmpty()) {
+        // The folder keeps its native name even where code page 1255 lacks letters of it.
+        Path compDir(QFile::encodeName(options.compDir).toStdString());
+        QString text = ToQString(card->card().shared().Paths.text(compDir));
+        control.ShowDoc(text, static_cast<short>(options.type), options.start);
+    }
     if (!control.lastError().isEmpty())
         messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("תקלה"),
                       FromQString(control.lastError()));

@@ -2,6 +2,7 @@
 
 #include "control/CardInterface.h"
 #include "control/Surface.h"
+#include "platform/Error.h"
 
 #include <QFileInfo>
 
@@ -204,6 +205,12 @@ TEST_F(CardWidgetTest, MessageBoxesCarryTheExactTitleTextIconAndButtons) {
     EXPECT_EQ(boxes[2].title, Q("שימו לב"));
     EXPECT_EQ(boxes[2].icon, QMessageBox::Question);
     EXPECT_EQ(boxes[2].buttons, QMessageBox::Yes | QMessageBox::No);
+
+    // A failure's description is UTF-8 and reads as written, Hebrew path and all.
+    widget->runForUser([] { throw Error("Cannot open /home/משה/ISHP.FIX"); });
+    ASSERT_EQ(boxes.size(), 4u);
+    EXPECT_EQ(boxes[3].title, Q("תקלה"));
+    EXPECT_EQ(boxes[3].text, Q("Cannot open /home/משה/ISHP.FIX"));
 }
 
 TEST_F(CardWidgetTest, MembersCanBeCalledByName) {

@@ -28,11 +28,11 @@ TEST(ServicesTest, TheClipboardKeepsHebrewTextAndTheBrowserGetsTheLocalFileOfThe
     QtBrowser browser;
     std::vector<QUrl> opened;
     browser.setOpener([&](const QUrl& url) { return opened.push_back(url), true; });
-    browser.Open(FromUtf8(page.string()));
+    browser.Open(Path(page.string()));
     ASSERT_EQ(opened.size(), 1u);
     EXPECT_EQ(opened[0].toLocalFile(), QString::fromStdString(page.string()));
     browser.setOpener([](const QUrl&) { return false; });
-    EXPECT_THROW(browser.Open(FromUtf8(page.string())), Error);
+    EXPECT_THROW(browser.Open(Path(page.string())), Error);
 }
 
 TEST(ServicesTest, HostValuesBecomeTheControlsVariantsAndBack) {
