@@ -101,7 +101,7 @@ TEST_F(HostSessionTest, SetAndGetRoundTripEachKind) {
 // Every byte of the code page is its own character in the JSON, control
 // characters included, and comes back as the same byte.
 TEST_F(HostSessionTest, TextCrossesTheJsonWithoutLoss) {
-    EXPECT_EQ(ask({"get", "CompanyTitle"})["value"], std::string(60, '\0'));
+    EXPECT_EQ(ask({"call", "CompanyTitle"})["result"], std::string(60, '\0'));
     std::string bytes;
     for (int b = 1; b < 256; ++b)
         bytes.push_back(static_cast<char>(b));
@@ -111,6 +111,15 @@ TEST_F(HostSessionTest, TextCrossesTheJsonWithoutLoss) {
     EXPECT_EQ(back, text);
     EXPECT_EQ(FromUtf8(back.get<std::string>()), bytes);
     EXPECT_EQ(back.get<std::string>().find("\xEF\xBF\xBD"), std::string::npos) << "no U+FFFD";
+
+    // A company folder whose name the code page cannot hold opens as it is named.
+    test::TestCompany company(kCompany);
+    test::TempDir temp;
+    std::filesystem::path folder = temp.path() / "Документы";
+    std::filesystem::copy(company.path(), folder);
+    EXPECT_EQ(ask({"call", "ShowDoc", folder.string(), 20, 2})["result"], 0);
+    EXPECT_EQ(ask({"get", "txtCustomerName"})["value"], "משה כהן");
+    EXPECT_EQ(ask({"get", "txtCompPath"})["value"], ToUtf8(FromUtf8(folder.string())));
 }
 
 TEST(CardMembersTest, ListsAndCheckBoxesTakeWholeNumbersInTheirRange) {

@@ -170,8 +170,13 @@ void HostSession::addCardCommands() {
     addCommand("call", [](HostSession& session, const HostArgs& args) {
         std::string member = args.text(0, "member");
         std::vector<Variant> values;
-        for (size_t i = 1; i < args.size(); ++i)
+        for (size_t i = 1; i < args.size(); ++i) {
             values.push_back(args.scalar(i, "argument"));
+            // A folder name the code page cannot hold is kept, so that the
+            // control's text of it still opens it.
+            if (args.at(i).is_string())
+                session.card().shared().Paths.text(Path(args.at(i).get<std::string>()));
+        }
         Variant result = CardInterface::Invoke(session.card(), member, values);
         return json{{"result", StateJson::FromVariant(result)}};
     });

@@ -27,7 +27,7 @@ void QtBrowser::setOpener(Opener opener) {
 // The browser gets the path as a local file address, which escapes spaces
 // and letters of any script properly.
 void QtBrowser::Open(const Path& path) {
-    const std::string& native = ResolvePath(path).native();
+    std::string native = ResolvePath(path).native();
     QString local =
         QFile::decodeName(QByteArray(native.data(), static_cast<qsizetype>(native.size())));
     QUrl url = QUrl::fromLocalFile(QFileInfo(local).absoluteFilePath());

@@ -49,8 +49,11 @@ TEST(ServicesTest, HostValuesBecomeTheControlsVariantsAndBack) {
     EXPECT_EQ(ToQVariant(Variant(W("שלום"))), QVariant(QString::fromUtf8("שלום")));
     EXPECT_EQ(ToQVariant(Variant(12)), QVariant(12.0));
     EXPECT_EQ(ToQVariant(Variant(false)), QVariant(false));
-    // A byte the code page leaves undefined shows as the replacement mark.
-    EXPECT_EQ(ToQString(std::string("\xFF", 1)), QString(QChar(0xFFFD)));
+    // Every byte is its own character and comes back: one the code page
+    // leaves undefined too, and a control byte.
+    std::string odd("\xFF\x01", 2);
+    EXPECT_EQ(ToQString(odd), QString::fromUtf8("\u00FF\u0001"));
+    EXPECT_EQ(FromQString(ToQString(odd)), odd);
 }
 
 } // namespace
