@@ -1,5 +1,7 @@
 #include "fixfiles/ReadingOrder.h"
 
+#include "platform/Ascii.h"
+
 #include <unicode/ubidi.h>
 #include <unicode/unistr.h>
 
@@ -45,10 +47,9 @@ icu::UnicodeString InverseReorder(const icu::UnicodeString& visual) {
 } // namespace
 
 std::string ReadingOrderText(std::string_view dosField) {
-    size_t first = dosField.find_first_not_of(' ');
-    if (first == std::string_view::npos)
+    std::string_view field = Trim(dosField);
+    if (field.empty())
         return {};
-    std::string_view field = dosField.substr(first, dosField.find_last_not_of(' ') - first + 1);
     if (std::none_of(field.begin(), field.end(), IsDosHebrew))
         return std::string(field);
 
