@@ -79,6 +79,7 @@ void AddSettings(CLI::App& app, Runner& run) {
 
 int main(int argc, char** argv) {
     CLI::App app{"dovrel: view the stock documents of a company of the accounting system"};
+    app.set_version_flag("--version", std::string("dovrel ") + DOVREL_VERSION);
     app.require_subcommand(1);
     Runner run;
     AddShow(app, run);

@@ -12,6 +12,8 @@ namespace dovrel {
 namespace {
 
 const QCommandLineOption kType("type", "The document type code (default 20).", "CODE", "20");
+// Answered in main before the window system is reached; listed here for --help.
+const QCommandLineOption kVersion("version", "Prints the version and stops.");
 const QCommandLineOption kStart("start", "The record to start from, 1 or more (default 2).", "N",
                                 "2");
 
@@ -21,6 +23,7 @@ void Describe(QCommandLineParser& parser) {
     parser.addPositionalArgument("COMPDIR", "The company directory to open.", "[COMPDIR]");
     parser.addOption(kType);
     parser.addOption(kStart);
+    parser.addOption(kVersion);
 }
 
 int Number(const QString& text, long long low, long long high, const char* what) {

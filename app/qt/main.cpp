@@ -20,8 +20,16 @@
 #include <QMainWindow>
 
 #include <iostream>
+#include <string_view>
 
 int main(int argc, char* argv[]) {
+    // Without a display, so that it works in any terminal.
+    for (int i = 1; i < argc; ++i) {
+        if (std::string_view(argv[i]) == "--version") {
+            std::cout << "dovrel-viewer " << DOVREL_VERSION << '\n';
+            return 0;
+        }
+    }
     QApplication app(argc, argv);
     QApplication::setApplicationName("dovrel-viewer");
     QApplication::setLayoutDirection(Qt::RightToLeft);
