@@ -46,7 +46,7 @@ find_program(DOVREL_HELP2MAN help2man)
 find_program(DOVREL_GZIP gzip REQUIRED)
 configure_file(${DOVREL_PACKAGING_DIR}/dovrel-viewer.1.in ${DOVREL_GENERATED_DIR}/dovrel-viewer.1
                @ONLY)
-set(DOVREL_MANUALS ${DOVREL_GENERATED_DIR}/dovrel-viewer.1.gz ${DOVREL_GENERATED_DIR}/changelog.gz)
+set(DOVREL_MANUALS ${DOVREL_GENERATED_DIR}/dovrel-viewer.1.gz)
 add_custom_command(
   OUTPUT ${DOVREL_GENERATED_DIR}/dovrel-viewer.1.gz ${DOVREL_GENERATED_DIR}/changelog.gz
   COMMAND ${DOVREL_GZIP} -9n -c ${DOVREL_GENERATED_DIR}/dovrel-viewer.1
@@ -66,7 +66,7 @@ if(DOVREL_HELP2MAN)
 else()
   install(CODE "message(FATAL_ERROR \"help2man is needed for dovrel.1: scripts/install-deps --test\")")
 endif()
-add_custom_target(manuals ALL DEPENDS ${DOVREL_MANUALS})
+add_custom_target(manuals ALL DEPENDS ${DOVREL_MANUALS} ${DOVREL_GENERATED_DIR}/changelog.gz)
 install(FILES ${DOVREL_MANUALS} DESTINATION ${CMAKE_INSTALL_MANDIR}/man1)
 install(FILES ${DOVREL_PACKAGING_DIR}/copyright DESTINATION ${CMAKE_INSTALL_DOCDIR})
 install(FILES ${DOVREL_GENERATED_DIR}/changelog.gz DESTINATION ${CMAKE_INSTALL_DOCDIR})
@@ -76,14 +76,16 @@ set(CPACK_PACKAGE_NAME dovrel)
 set(CPACK_PACKAGE_VENDOR "The Dovrel developers")
 set(CPACK_PACKAGE_CONTACT "The Dovrel developers <dovrel@example.org>")
 set(CPACK_PACKAGE_DESCRIPTION_SUMMARY "viewer for the stock documents of a DOS accounting system")
-set(CPACK_PACKAGE_DESCRIPTION
-    "Shows the stock documents of a DOS-era Hebrew accounting system (tax invoices, "
-    "delivery notes, orders, quotations, stock movements) one at a time, right to "
-    "left, and prints them through the web browser. It reads the accounting "
-    "system's data files read-only, while that system keeps running.\n"
-    "This package holds the desktop viewer dovrel-viewer, the command dovrel and "
-    "a demo company.")
-string(JOIN "" CPACK_PACKAGE_DESCRIPTION ${CPACK_PACKAGE_DESCRIPTION})
+# Debian shows the lines as they stand: each under 80 characters.
+string(CONCAT CPACK_PACKAGE_DESCRIPTION
+  "Dovrel shows the stock documents of a DOS-era Hebrew accounting system\n"
+  "(tax invoices, delivery notes, orders, quotations, stock movements) one at\n"
+  "a time, right to left, and prints them through the web browser. It reads\n"
+  "the accounting system's data files read-only, while that system keeps\n"
+  "running.\n"
+  "\n"
+  "This package holds the desktop viewer dovrel-viewer, the command dovrel\n"
+  "and a demo company.")
 set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
 set(CPACK_DEBIAN_PACKAGE_SECTION misc)
 set(CPACK_DEBIAN_PACKAGE_PRIORITY optional)
