@@ -4,7 +4,8 @@
 # CMakeLists.txt, once every target exists.
 include(GNUInstallDirs)
 
-# The day of the release the metainfo names; moves with PROJECT_VERSION.
+# The day of the release the metainfo names; moves with PROJECT_VERSION, as
+# does the first entry of packaging/changelog (scripts/check-package checks it).
 set(DOVREL_RELEASE_DATE 2026-12-06)
 
 foreach(program dovrel-cli dovrel-viewer)
@@ -64,7 +65,7 @@ if(DOVREL_HELP2MAN)
     COMMENT "Writing the manual page dovrel.1")
   list(APPEND DOVREL_MANUALS ${DOVREL_GENERATED_DIR}/dovrel.1.gz)
 else()
-  install(CODE "message(FATAL_ERROR \"help2man is needed for dovrel.1: scripts/install-deps --test\")")
+  install(CODE "message(FATAL_ERROR \"help2man is needed for dovrel.1: scripts/install-deps --package\")")
 endif()
 add_custom_target(manuals ALL DEPENDS ${DOVREL_MANUALS} ${DOVREL_GENERATED_DIR}/changelog.gz)
 install(FILES ${DOVREL_MANUALS} DESTINATION ${CMAKE_INSTALL_MANDIR}/man1)
