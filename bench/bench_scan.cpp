@@ -137,10 +137,11 @@ void RegisterProgress() {
         [] {
             auto on = std::make_shared<Walker>(Data().big, kBondedExitRow, "First");
             auto calls = std::make_shared<int64_t>(0);
-            on->bench().card().ProgressFill.changed.connect([calls] { ++*calls; });
+            auto listening = std::make_shared<Connection>(
+                on->bench().card().ProgressFill.changed.connect([calls] { ++*calls; }));
             auto off = std::make_shared<Walker>(Data().big, kBondedExitRow, "First");
             off->bench().card().ProgressFrame.setWidth(0);
-            Work counted = [on, calls] { return on->once() && *calls > 0; };
+            Work counted = [on, calls, listening] { return on->once() && *calls > 0; };
             return std::pair{counted, Once(off)};
         },
         kProgressRounds);

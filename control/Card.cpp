@@ -63,7 +63,7 @@ void Card::buildControls() {
                 list->AddItem(entry);
         controls_.push_back(control);
     }
-    txtCompPath.changed.connect([this] { txtCompPath_Change(); });
+    compPathChanged_ = txtCompPath.changed.connect([this] { txtCompPath_Change(); });
     InitDocLines();
 }
 

@@ -2,9 +2,12 @@
 
 #include "control/ModuleState.h"
 #include "fixfiles/DocumentView.h"
+#include "forms/FormHost.h"
+#include "pictures/ItemPicsHost.h"
 #include "platform/Browser.h"
 #include "platform/Clipboard.h"
 #include "platform/Clock.h"
+#include "platform/Connection.h"
 #include "platform/Container.h"
 #include "platform/Form.h"
 #include "platform/Messages.h"
@@ -37,18 +40,27 @@ struct CardServices {
 // it, runs its start-up (UserControl_InitProperties), sets its properties and
 // calls ShowDoc or SetParams; the user's clicks arrive through Click,
 // DblClick and LostFocus.
-class Card : public DocumentView {
+class Card : public DocumentView, public FormHost, public ItemPicsHost {
 public:
     // A control with its own headless services: settings kept in memory,
     // forms closed at once, a private clipboard, pages kept unopened, the
-    // system's date; messages must outlive it.
-    explicit Card(Messages& messages, ModuleState& shared = ModuleState::ofThisThread());
-    explicit Card(const CardServices& services, ModuleState& shared = ModuleState::ofThisThread());
+    // system's date; messages and the shared state must outlive it.
+    Card(Messages& messages, ModuleState& shared);
+    Card(const CardServices& services, ModuleState& shared);
     ~Card() override;
 
     ModuleState& shared() { return shared_; }
     const ModuleState& shared() const { return shared_; }
     const CardServices& services() const { return services_; }
+
+    // What the side forms use of the control and of the shared state.
+    Messages& formMessages() override { return services_.messages; }
+    Clipboard& formClipboard() override { return services_.clipboard; }
+    std::string& companyDirectory() override { return shared_.CompDir; }
+    const AccountEntry& currentAccount() const override { return shared_.Accounts.CurrentAccount; }
+    SettingsStore& settingsStore() override { return services_.settings; }
+    const std::string& settingsName() const override { return shared_.AppName; }
+    PageSettingRefs pageSettings() override;
 
     // Every child control, in the order of the surface table; nullptr for an
     // unknown name.
@@ -160,6 +172,7 @@ private:
     std::vector<std::unique_ptr<Control>> plain_; // labels, buttons, frames
     std::vector<Control*> controls_;
     PageFile* openPage_ = nullptr; // the page being built, for WriteCell
+    Connection compPathChanged_;
 };
 
 } // namespace dovrel

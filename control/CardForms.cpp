@@ -1,5 +1,6 @@
 #include "control/CardForms.h"
 
+#include "control/Card.h"
 #include "forms/AccDetailsForm.h"
 #include "forms/OpenDirForm.h"
 #include "pictures/ItemPicsForm.h"

@@ -8,7 +8,12 @@
 namespace dovrel {
 
 void Card::FillPicPath(std::string& pDbName) {
-    FillPictures(pDbName, shared_.Doc);
+    FillPictures(pDbName, shared_.Doc, shared_.Pictures);
+}
+
+PageSettingRefs Card::pageSettings() {
+    return {shared_.LogoFile, shared_.CompTitle, shared_.DBPath,
+            shared_.PicPath,  shared_.PicX,      shared_.PicY};
 }
 
 // Closing the form drops what was typed but not saved: it is loaded again

@@ -4,6 +4,7 @@
 #include "fixfiles/CompanyFile.h"
 #include "fixfiles/CurrentDocument.h"
 #include "fixfiles/DocTypes.h"
+#include "pictures/PictureCache.h"
 #include "platform/Form.h"
 #include "platform/PathNames.h"
 
@@ -15,8 +16,10 @@ namespace dovrel {
 
 // The state every control of a thread shares: the company directory, the
 // settings name, the picture paths, the document-type tables, the current
-// document, the accounts, the company record and the side forms. Each Card keeps only its own
-// position and search. This is the one piece of module-wide state; there is one per thread.
+// document, the accounts, the company record, the side forms and the picture
+// ranges last read. Each Card keeps only its own position and search. A front
+// end makes one per thread or session and passes it to every control it makes;
+// the controls sharing one must run on one thread.
 struct ModuleState {
     std::string CompDir;
     std::string AppName = "Dovrel";
@@ -40,9 +43,8 @@ struct ModuleState {
     PathNames Paths;
     // The side forms by name, each made on first use and kept.
     std::map<std::string, std::unique_ptr<Form>> Forms;
-
-    // The state of the calling thread, made on first use.
-    static ModuleState& ofThisThread();
+    // The picture ranges of the last picture database read.
+    PictureCache Pictures;
 };
 
 } // namespace dovrel

@@ -155,19 +155,6 @@ void AddDecoration(std::vector<ControlDesign>& s) {
 
 } // namespace
 
-ControlDesign Design(std::string name, ControlKind kind, const char* captionUtf8, int32_t left,
-                     int32_t top, int32_t width, int32_t height) {
-    ControlDesign d;
-    d.name = std::move(name);
-    d.kind = kind;
-    d.caption = FromUtf8(captionUtf8);
-    d.left = left;
-    d.top = top;
-    d.width = width;
-    d.height = height;
-    return d;
-}
-
 const std::vector<ControlDesign>& CardSurface() {
     static const std::vector<ControlDesign> surface = [] {
         std::vector<ControlDesign> s;

@@ -1,17 +1,20 @@
 #include "forms/AccDetailsForm.h"
 
-#include "control/Card.h"
+#include "fixfiles/AccountsFile.h"
 #include "forms/FormDesigns.h"
+#include "forms/FormHost.h"
+#include "platform/Clipboard.h"
+#include "platform/Messages.h"
 #include "platform/Encoding.h"
 #include "platform/Error.h"
 
 namespace dovrel {
 
-AccDetailsForm::AccDetailsForm(Card& card)
+AccDetailsForm::AccDetailsForm(FormHost& host)
     : Form("frmAccDetails"), cmdCopyText{Button(ArrayElementName("cmdCopyText", 0)),
                                          Button(ArrayElementName("cmdCopyText", 1)),
                                          Button(ArrayElementName("cmdCopyText", 2))},
-      shared_(card.shared()), card_(&card) {
+      account_(host.currentAccount()), host_(&host) {
     for (Control* control :
          std::initializer_list<Control*>{&Label1, &txtPhone, &cmdCopyText[0], &Label2, &txtDetails,
                                          &cmdCopyText[1], &Label3, &txtDistrict, &cmdCopyText[2]}) {
@@ -22,14 +25,14 @@ AccDetailsForm::AccDetailsForm(Card& card)
     }
 }
 
-void AccDetailsForm::prepare(Card& card) {
-    card_ = &card;
+void AccDetailsForm::prepare(FormHost& host) {
+    host_ = &host;
     Load();
 }
 
 // A window loaded afresh: the account's texts, nothing selected.
 void AccDetailsForm::Load() {
-    const AccountEntry& account = shared_.Accounts.CurrentAccount;
+    const AccountEntry& account = account_;
     txtPhone.setText(account.Phone);
     txtDetails.setText(account.Details);
     txtDistrict.setText(account.District);
@@ -59,12 +62,12 @@ void AccDetailsForm::cmdCopyText_Click(int16_t Index) {
     if (text.empty())
         text = box.Text();
     if (text.empty()) {
-        card_->services().messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("שגיאה"),
+        host_->formMessages().show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("שגיאה"),
                                         FromUtf8("לא נמצא טקסט להעתקה"));
         return;
     }
     // A clipboard that another program holds must not keep the window open.
-    IgnoringErrors([&] { card_->services().clipboard.SetText(text); });
+    IgnoringErrors([&] { host_->formClipboard().SetText(text); });
     Hide();
 }
 

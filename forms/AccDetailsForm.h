@@ -9,8 +9,8 @@
 
 namespace dovrel {
 
-class Card;
-struct ModuleState;
+class FormHost;
+struct AccountEntry;
 
 // The account details window: the phones, details and district of the
 // account on screen, each with a button that copies it and closes the
@@ -18,11 +18,11 @@ struct ModuleState;
 // named "cmdCopyText(0)" to "cmdCopyText(2)".
 class AccDetailsForm : public Form {
 public:
-    explicit AccDetailsForm(Card& card);
+    explicit AccDetailsForm(FormHost& host);
 
     // The control that shows the window now: its clipboard and messages are
     // used, and the boxes are filled afresh from the current account.
-    void prepare(Card& card);
+    void prepare(FormHost& host);
 
     // Fills the boxes from the current account.
     void Load() override;
@@ -42,8 +42,8 @@ public:
     std::array<Button, 3> cmdCopyText;
 
 private:
-    ModuleState& shared_;
-    Card* card_;
+    const AccountEntry& account_;
+    FormHost* host_;
 };
 
 } // namespace dovrel

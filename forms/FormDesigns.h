@@ -1,6 +1,6 @@
 #pragma once
 
-#include "control/Surface.h"
+#include "platform/ControlDesign.h"
 
 #include <cstdint>
 #include <string>

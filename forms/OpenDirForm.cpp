@@ -1,6 +1,7 @@
 #include "forms/OpenDirForm.h"
 
-#include "control/Card.h"
+#include "forms/FormHost.h"
+#include "platform/Messages.h"
 #include "forms/FormDesigns.h"
 #include "platform/Encoding.h"
 #include "platform/Error.h"
@@ -15,11 +16,11 @@ constexpr const char* kScanDone = "הסריקה הסתיימה. תקתוק כפ�
 
 } // namespace
 
-OpenDirForm::OpenDirForm(Card& card) : OpenDirForm(card, SystemMountPoints()) {}
+OpenDirForm::OpenDirForm(FormHost& host) : OpenDirForm(host, SystemMountPoints()) {}
 
-OpenDirForm::OpenDirForm(Card& card, std::vector<std::string> drives)
-    : Form("frmOpenDir"), PathDrive("PathDrive", std::move(drives)), shared_(card.shared()),
-      card_(&card) {
+OpenDirForm::OpenDirForm(FormHost& host, std::vector<std::string> drives)
+    : Form("frmOpenDir"), PathDrive("PathDrive", std::move(drives)), compDir_(host.companyDirectory()),
+      host_(&host) {
     for (Control* control :
          std::initializer_list<Control*>{&Label1, &PathDrive, &MainDir, &cmdFindWizComp,
                                          &cmbCompany, &Msg1, &CancelButton, &OKButton}) {
@@ -30,12 +31,12 @@ OpenDirForm::OpenDirForm(Card& card, std::vector<std::string> drives)
     }
     if (PathDrive.ListCount() > 0)
         IgnoringErrors([&] { MainDir.setPath(PathDrive.Drive()); });
-    PathDrive.changed.connect([this] { PathDrive_Change(); });
-    MainDir.changed.connect([this] { MainDir_Change(); });
+    driveChanged_ = PathDrive.changed.connect([this] { PathDrive_Change(); });
+    dirChanged_ = MainDir.changed.connect([this] { MainDir_Change(); });
 }
 
-void OpenDirForm::prepare(Card& card) {
-    card_ = &card;
+void OpenDirForm::prepare(FormHost& host) {
+    host_ = &host;
     if (!unloaded_)
         return;
     reset();
@@ -145,7 +146,7 @@ void OpenDirForm::OKButton_Click() {
         showError("שגיאה", FromUtf8("לא בחרת חברה"));
         return;
     }
-    shared_.CompDir = companies_[listed_[static_cast<size_t>(index)]].path;
+    compDir_ = companies_[listed_[static_cast<size_t>(index)]].path;
     lastDrive_ = PathDrive.Drive();
     lastMainDir_ = MainDir.Path();
     Hide();
@@ -159,7 +160,7 @@ void OpenDirForm::CancelButton_Click() {
 void OpenDirForm::showError(const char* titleUtf8, const std::string& text) {
     if (!Visible())
         throw Error(ToUtf8(text));
-    card_->services().messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8(titleUtf8), text);
+    host_->formMessages().show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8(titleUtf8), text);
 }
 
 } // namespace dovrel

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "forms/Companies.h"
+#include "platform/Connection.h"
 #include "platform/Controls.h"
 #include "platform/Form.h"
 #include "platform/ListControls.h"
@@ -10,8 +11,7 @@
 
 namespace dovrel {
 
-class Card;
-struct ModuleState;
+class FormHost;
 
 // The company chooser: finds the companies under a main directory and sets
 // the control's company path to the one the user picks. The form is kept
@@ -20,14 +20,14 @@ struct ModuleState;
 class OpenDirForm : public Form {
 public:
     // A form whose drive list shows the mount points of this system.
-    explicit OpenDirForm(Card& card);
-    OpenDirForm(Card& card, std::vector<std::string> drives);
+    explicit OpenDirForm(FormHost& host);
+    OpenDirForm(FormHost& host, std::vector<std::string> drives);
 
     // The control that shows the form now; its message box is the one used.
     // Reloads the form when its window was closed. The buttons work only
     // while the form is shown, and a hidden form shows no message: what it
     // would say is thrown to the caller instead.
-    void prepare(Card& card);
+    void prepare(FormHost& host);
 
     void Load() override;
     void Click(const std::string& name) override;
@@ -67,13 +67,15 @@ private:
     void requireShown(const std::string& control) const;
     void reset();
 
-    ModuleState& shared_;
-    Card* card_;
+    std::string& compDir_;
+    FormHost* host_;
     std::vector<CompanyEntry> companies_;
     std::vector<size_t> listed_; // the company of each list entry
     std::string lastDrive_;
     std::string lastMainDir_;
     bool unloaded_ = false;
+    Connection driveChanged_;
+    Connection dirChanged_;
 };
 
 } // namespace dovrel

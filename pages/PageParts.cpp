@@ -9,7 +9,6 @@
 #include <algorithm>
 #include <charconv>
 #include <cstdio>
-#include <unordered_map>
 
 namespace dovrel {
 
@@ -37,13 +36,10 @@ std::string JoinDate(int year, int month, int day, bool monthFirst, char separat
 
 } // namespace
 
-const std::string& H(const char* utf8) {
-    // The page's Hebrew words are literals: each is converted once.
-    thread_local std::unordered_map<const char*, std::string> converted;
-    auto [entry, added] = converted.try_emplace(utf8);
-    if (added)
-        entry->second = FromUtf8(utf8);
-    return entry->second;
+std::string H(const char* utf8) {
+    // A handful of short words a page, each a table lookup a character:
+    // converting them as they come costs less than keeping them.
+    return FromUtf8(utf8);
 }
 
 void WriteHead(PageFile& page) {

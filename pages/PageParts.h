@@ -8,8 +8,8 @@
 // Pieces both document pages share.
 namespace dovrel::page {
 
-// A code page 1255 text from a UTF-8 string literal, converted once.
-const std::string& H(const char* utf8);
+// A code page 1255 text from a UTF-8 string literal.
+std::string H(const char* utf8);
 
 // The five lines every page starts with, before its style block.
 void WriteHead(PageFile& page);

@@ -1,11 +1,12 @@
 #include "pictures/ItemPicsForm.h"
 
-#include "control/Card.h"
 #include "pictures/ItemPicsDesign.h"
 #include "pictures/PictureDb.h"
 #include "platform/Encoding.h"
 #include "platform/Error.h"
 #include "platform/FileSystem.h"
+#include "platform/Messages.h"
+#include "platform/SettingsBinding.h"
 
 #include <climits>
 #include <map>
@@ -52,7 +53,8 @@ std::optional<std::string> NullWhenEmpty(const std::string& text) {
 
 } // namespace
 
-ItemPicsForm::ItemPicsForm(Card& card) : Form("frmItemPics"), shared_(card.shared()), card_(&card) {
+ItemPicsForm::ItemPicsForm(ItemPicsHost& host)
+    : Form("frmItemPics"), settings_(host.pageSettings()), host_(&host) {
     buildControls();
 }
 
@@ -81,14 +83,14 @@ void ItemPicsForm::buildControls() {
     }
 }
 
-Card& ItemPicsForm::card() const {
-    if (card_ == nullptr)
+ItemPicsHost& ItemPicsForm::host() const {
+    if (host_ == nullptr)
         throw Error("The picture settings form has no control to work with");
-    return *card_;
+    return *host_;
 }
 
 Messages& ItemPicsForm::messages() const {
-    return card().services().messages;
+    return host().formMessages();
 }
 
 void ItemPicsForm::showFailure(const std::exception& failure) const {
@@ -101,7 +103,7 @@ bool ItemPicsForm::confirm(const char* questionUtf8) const {
 }
 
 std::string ItemPicsForm::settingDbName() const {
-    return shared_.DBPath + PictureDb::kFileName;
+    return settings_.DBPath + PictureDb::kFileName;
 }
 
 void ItemPicsForm::Load() {
@@ -116,12 +118,12 @@ void ItemPicsForm::Load() {
 }
 
 void ItemPicsForm::mirrorSettings() {
-    shared_.LogoFile = txtLogoFile.Text();
-    shared_.CompTitle = txtCompTitle.Text();
-    shared_.DBPath = txtDBPath.Text();
-    shared_.PicPath = txtPicPath.Text();
-    shared_.PicX = txtPicX.Text();
-    shared_.PicY = txtPicY.Text();
+    settings_.LogoFile = txtLogoFile.Text();
+    settings_.CompTitle = txtCompTitle.Text();
+    settings_.DBPath = txtDBPath.Text();
+    settings_.PicPath = txtPicPath.Text();
+    settings_.PicX = txtPicX.Text();
+    settings_.PicY = txtPicY.Text();
 }
 
 void ItemPicsForm::InitItemPicLines() {
@@ -160,7 +162,7 @@ int32_t ItemPicsForm::RowRangeID(int32_t row) const {
 
 void ItemPicsForm::SetGetMoreParams(uint8_t Action) {
     for (const Setting& setting : kSettings)
-        card().SetGetRegParam(Action, shared_.AppName, "Params", setting.key, this->*setting.box, 1,
+        BindSetting(host().settingsStore(), Action, host().settingsName(), "Params", setting.key, this->*setting.box, 1,
                               Variant(FromUtf8(setting.defaultUtf8)));
 }
 
@@ -265,7 +267,7 @@ void ItemPicsForm::CmdUpdate_Click() {
 void ItemPicsForm::CmdInitDB_Click() {
     if (!confirm("האם אתה בטוח?"))
         return;
-    shared_.DBPath = txtDBPath.Text();
+    settings_.DBPath = txtDBPath.Text();
     std::string dbName = settingDbName();
     bool replaceForeign = false;
     try {

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "pictures/ItemPicsHost.h"
 #include "platform/Controls.h"
 #include "platform/Form.h"
 #include "platform/Grid.h"
@@ -11,9 +12,8 @@
 
 namespace dovrel {
 
-class Card;
+class ItemPicsHost;
 class Messages;
-struct ModuleState;
 
 // The picture settings form: the printed page's settings and the ranges of
 // item keys and category codes with their pictures. The form lives in the
@@ -21,15 +21,15 @@ struct ModuleState;
 // and works through the services of the control that last attached it.
 class ItemPicsForm : public Form {
 public:
-    explicit ItemPicsForm(Card& card);
+    explicit ItemPicsForm(ItemPicsHost& host);
 
     // The control whose settings store and message boxes the form uses from now on.
-    void attach(Card& card) { card_ = &card; }
+    void attach(ItemPicsHost& host) { host_ = &host; }
     // A control that goes away lets go of the form; until another control
     // attaches it, the form's work that needs one is refused.
-    void detach(const Card& card) {
-        if (card_ == &card)
-            card_ = nullptr;
+    void detach(const ItemPicsHost& host) {
+        if (host_ == &host)
+            host_ = nullptr;
     }
 
     // Resets the grid, loads the six settings, mirrors them into the module
@@ -76,15 +76,15 @@ private:
     void mirrorSettings();
     // The database file at the DBPath setting.
     std::string settingDbName() const;
-    Card& card() const;
+    ItemPicsHost& host() const;
     Messages& messages() const;
     // Shows a database failure under the title "תקלה".
     void showFailure(const std::exception& failure) const;
     bool confirm(const char* questionUtf8) const;
     void reloadGrid();
 
-    ModuleState& shared_;
-    Card* card_;
+    PageSettingRefs settings_;
+    ItemPicsHost* host_;
     std::vector<std::unique_ptr<Control>> plain_; // labels and frames
     std::vector<int32_t> rangeIds_;               // by grid row, heading included
 };

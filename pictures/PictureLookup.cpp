@@ -3,6 +3,7 @@
 #include "platform/Ascii.h"
 
 #include "fixfiles/CurrentDocument.h"
+#include "pictures/PictureCache.h"
 #include "pictures/PictureCollation.h"
 #include "platform/Error.h"
 #include "platform/FileSystem.h"
@@ -10,10 +11,6 @@
 #include <algorithm>
 #include <memory>
 #include <optional>
-
-#include <fcntl.h>
-#include <sys/stat.h>
-#include <unistd.h>
 
 namespace dovrel {
 
@@ -76,65 +73,10 @@ const std::string* PictureLookup::pictureFor(std::string_view itemKey,
     return nullptr;
 }
 
-namespace {
-
-// What tells one state of a database file from another: the file itself and
-// SQLite's change counter, which every committed change of a file in
-// rollback-journal mode raises. Files in other modes are never taken as unchanged.
-struct FileState {
-    dev_t device = 0;
-    ino_t inode = 0;
-    off_t size = 0;
-    int64_t modifiedNs = 0;
-    std::string counter;
-
-    bool operator==(const FileState&) const = default;
-};
-
-std::optional<FileState> StateOf(const std::string& fsPath) {
-    int fd = open(fsPath.c_str(), O_RDONLY | O_CLOEXEC);
-    if (fd < 0)
-        return std::nullopt;
-    struct stat info {};
-    unsigned char head[28] = {};
-    bool read = fstat(fd, &info) == 0 && pread(fd, head, sizeof head, 0) == sizeof head;
-    close(fd);
-    if (!read || head[18] != 1 || head[19] != 1)
-        return std::nullopt;
-    return FileState{info.st_dev, info.st_ino, info.st_size,
-                     int64_t{info.st_mtim.tv_sec} * 1000000000 + info.st_mtim.tv_nsec,
-                     std::string(reinterpret_cast<const char*>(head + 24), 4)};
-}
-
-// The ranges of the database as the lookup needs them. Reading and preparing
-// them costs far more than a page's lines, so the last database read on this
-// thread is kept in memory (never the file) for as long as the file is unchanged.
-std::shared_ptr<const PictureLookup> LookupOf(const std::string& dbName) {
-    struct Kept {
-        std::string fsPath;
-        FileState state;
-        std::shared_ptr<const PictureLookup> lookup;
-    };
-    thread_local Kept kept;
-    std::string fsPath = ResolvePath(PathFromCp1255(dbName)).native();
-    std::optional<FileState> before = StateOf(fsPath);
-    if (before && kept.lookup && kept.fsPath == fsPath && kept.state == *before)
-        return kept.lookup;
-    auto lookup = std::make_shared<const PictureLookup>(PictureDb(dbName).rangesInLookupOrder());
-    std::optional<FileState> after = StateOf(fsPath);
-    if (before && after && *before == *after)
-        kept = {fsPath, *after, lookup};
-    else
-        kept = {};
-    return lookup;
-}
-
-} // namespace
-
-void FillPictures(const std::string& dbName, CurrentDocument& doc) {
+void FillPictures(const std::string& dbName, CurrentDocument& doc, PictureCache& cache) {
     if (!FileExists(PathFromCp1255(dbName)))
         return;
-    std::shared_ptr<const PictureLookup> found = LookupOf(dbName);
+    std::shared_ptr<const PictureLookup> found = cache.lookupOf(dbName);
     const PictureLookup& lookup = *found;
     int count = std::clamp<int>(doc.lineCount, 0, kMaxDocLines);
     for (int i = 1; i <= count; ++i) {

@@ -10,6 +10,7 @@
 
 namespace dovrel {
 
+class PictureCache;
 struct CurrentDocument;
 
 // Finds the picture of a document line among the picture ranges. Bounds are
@@ -51,7 +52,8 @@ private:
 
 // Gives each line of the document the picture file of the last range that
 // contains it (padded with spaces to 50 characters, cut at 50); lines that no
-// range contains keep theirs. A missing database file changes nothing.
-void FillPictures(const std::string& dbName, CurrentDocument& doc);
+// range contains keep theirs. A missing database file changes nothing. The
+// cache keeps the ranges between calls.
+void FillPictures(const std::string& dbName, CurrentDocument& doc, PictureCache& cache);
 
 } // namespace dovrel

@@ -50,7 +50,7 @@ TEST_F(AccountsFileTest, LoadsEveryAccountInFileOrderAndFindsTheFirstOfAKey) {
                                Account("1001", "02-2222222", "", "second of the key")}}}
                             .dump());
     bool moved = false;
-    fill.changed.connect([&] { moved = moved || fill.Width() > 0; });
+    Connection watching = fill.changed.connect([&] { moved = moved || fill.Width() > 0; });
     ASSERT_TRUE(ReadACT(PathFromCp1255(company.compPath()), table, progress));
     EXPECT_EQ(table.AccountCount, 4);
     ASSERT_EQ(KeysOf(table), (Keys{"", "1001", "ab1", W("דן"), "1001"}));

@@ -132,7 +132,7 @@ TEST(CompaniesTest, TheDirectoryTreeShowsOnlyDirectoriesThatExist) {
     std::ofstream(dir.path() / "file") << "x";
     DirListBox tree("MainDir");
     int changes = 0;
-    tree.changed.connect([&] { ++changes; });
+    Connection watching = tree.changed.connect([&] { ++changes; });
     tree.setPath(FromUtf8(dir.str()));
     tree.setPath(FromUtf8(dir.str()));
     EXPECT_EQ(changes, 1);

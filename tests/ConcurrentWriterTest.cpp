@@ -305,7 +305,7 @@ Result ConcurrentWriterTest::checkDocument(const Search& search) {
 TEST_F(ConcurrentWriterTest, ScansEndWithAWholeDocumentOrNothingAndNeverWrite) {
     std::pair<int, int> duringScans{0, 0};
     int progressChecks = 0;
-    card.ProgressFill.changed.connect([&] {
+    Connection watching = card.ProgressFill.changed.connect([&] {
         if (++progressChecks % 4 != 0)
             return;
         auto [count, writable] = OpenFds(file);

@@ -122,7 +122,7 @@ TEST(GridTest, CurrentRowAndHeadingRows) {
 TEST(GridTest, EveryChangeIsAnnouncedOnce) {
     Grid grid("g");
     int announced = 0;
-    grid.changed.connect([&] { ++announced; });
+    Connection watching = grid.changed.connect([&] { ++announced; });
     auto changes = [&](auto&& action) {
         int before = announced;
         action();

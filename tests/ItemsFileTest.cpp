@@ -99,7 +99,7 @@ TEST_F(ItemsFileTest, ProgressMovesDuringALongScanAndEndsEmpty) {
     CurrentDocument doc = DocumentWithKeys({"I199"});
     fill.setWidth(700);
     std::vector<int32_t> widths;
-    fill.changed.connect([&] { widths.push_back(fill.Width()); });
+    Connection watching = fill.changed.connect([&] { widths.push_back(fill.Width()); });
     ASSERT_TRUE(ReadITM(PathFromCp1255(company.compPath()), doc, progress));
     EXPECT_EQ(doc.lines[1].foreignName, "Item 199");
     // 202 records: the bar is emptied, moves at records 5, 10, ... 200 of the 201 read,
@@ -126,7 +126,7 @@ TEST_F(ItemsFileTest, AFileThatShrinksDuringTheScanEndsItWithWhatWasRead) {
     TestCompany company(Items(ManyItems(1000)));
     CurrentDocument doc = DocumentWithKeys({"I3", "I900"});
     bool cut = false;
-    fill.changed.connect([&] {
+    Connection watching = fill.changed.connect([&] {
         if (fill.Width() > 0 && !std::exchange(cut, true))
             std::filesystem::resize_file(company.file("ITM.fix"), 300 * 500);
     });

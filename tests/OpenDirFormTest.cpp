@@ -40,7 +40,7 @@ protected:
     void scanThen(const std::function<void(OpenDirForm&)>& then) {
         forms.user = [&](OpenDirForm& form) {
             if (form.repaint.empty())
-                form.repaint.connect(
+                repainting = form.repaint.connect(
                     [&form, this] { statusWhileScanning = U(form.Msg1.Caption()); });
             form.MainDir.setPath(FromUtf8(main.str()));
             form.Click("cmdFindWizComp");
@@ -58,6 +58,7 @@ protected:
     }
 
     TempDir main;
+    Connection repainting;
     std::string statusWhileScanning;
     std::unique_ptr<Card> card;
 };

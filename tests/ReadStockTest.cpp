@@ -311,7 +311,7 @@ TEST_F(ReadStockTest, ProgressMovesDuringALongScanAndEndsEmpty) {
     write({{"documents", {Filler("IMV.FIX", 3000), Doc(1, "9", "א")}}});
     int32_t widest = 0;
     int changes = 0;
-    card->ProgressFill.changed.connect([&] {
+    Connection watching = card->ProgressFill.changed.connect([&] {
         widest = std::max(widest, card->ProgressFill.Width());
         ++changes;
     });

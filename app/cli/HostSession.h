@@ -37,9 +37,8 @@ public:
     using Command = std::function<nlohmann::json(HostSession&, const HostArgs&)>;
 
     // Settings kept in memory: nothing the user stored is read or changed.
-    explicit HostSession(ModuleState& shared = ModuleState::ofThisThread());
-    HostSession(std::unique_ptr<SettingsStore> settings,
-                ModuleState& shared = ModuleState::ofThisThread());
+    explicit HostSession(ModuleState& shared);
+    HostSession(std::unique_ptr<SettingsStore> settings, ModuleState& shared);
     ~HostSession();
 
     // The answer to one input line; nothing for a blank line.

@@ -37,7 +37,9 @@ void AddPrint(CLI::App& app, Runner& run) {
             XdgOpenBrowser browser;
             RecordingBrowser none;
             bool open = options->open && options->count == 1;
-            PrintCommand command(*options, settings, open ? static_cast<Browser&>(browser) : none);
+            ModuleState state;
+            PrintCommand command(*options, settings, open ? static_cast<Browser&>(browser) : none,
+                                 state);
             return command.run(std::cout, std::cerr);
         };
     });

@@ -31,7 +31,7 @@ struct PrintOptions {
 class PrintCommand {
 public:
     PrintCommand(PrintOptions options, SettingsStore& settings, Browser& browser,
-                 ModuleState& shared = ModuleState::ofThisThread());
+                 ModuleState& shared);
 
     // Exit code: 0 when every page was written, 1 when none could be.
     int run(std::ostream& out, std::ostream& err);

@@ -99,7 +99,7 @@ void ShowCommand::read(Card& card) {
 void ShowCommand::watchProgress(Card& card) {
     if (progress_ == nullptr)
         return;
-    card.ProgressFill.changed.connect([this, &card] {
+    progressShown_ = card.ProgressFill.changed.connect([this, &card] {
         int32_t frame = std::max(card.ProgressFrame.Width(), 1);
         int32_t percent = std::clamp(card.ProgressFill.Width() * 100 / frame, 0, 100);
         if (card.ProgressFill.Width() == 0)

@@ -23,7 +23,7 @@ struct ShowOptions {
 // order) or as the control's state in JSON.
 class ShowCommand {
 public:
-    explicit ShowCommand(ShowOptions options, ModuleState& shared = ModuleState::ofThisThread());
+    ShowCommand(ShowOptions options, ModuleState& shared);
 
     // Exit code: 0 when the document (or the note that there is none) was
     // printed, 1 when the reader showed a message box (printed on err).
@@ -49,6 +49,7 @@ private:
     int16_t row_ = 0;
     bool companyRead_ = false;
     std::ostream* progress_ = nullptr;
+    Connection progressShown_;
 };
 
 } // namespace dovrel

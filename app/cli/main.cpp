@@ -29,7 +29,8 @@ void AddShow(CLI::App& app, Runner& run) {
     show->add_flag("--json", options->json, "Print the control's state as JSON");
     show->callback([options, &run] {
         run = [options] {
-            dovrel::ShowCommand command(*options);
+            dovrel::ModuleState state;
+            dovrel::ShowCommand command(*options, state);
             if (isatty(STDERR_FILENO))
                 command.setProgress(&std::cerr);
             return command.run(std::cout, std::cerr);
@@ -44,7 +45,8 @@ void AddHost(CLI::App& app, Runner& run) {
     host->add_option("--today", *today, "Today's date on printed pages, YYYY-MM-DD");
     host->callback([today, &run] {
         run = [today] {
-            dovrel::HostSession session(std::make_unique<dovrel::SqliteSettingsStore>());
+            dovrel::ModuleState state;
+            dovrel::HostSession session(std::make_unique<dovrel::SqliteSettingsStore>(), state);
             if (!today->empty())
                 session.setToday(dovrel::PrintCommand::ParseDay(*today));
             return session.serve(std::cin, std::cout);

@@ -22,9 +22,7 @@ class CardWidget : public QWidget {
     Q_OBJECT
 
 public:
-    explicit CardWidget(const CardServices& services,
-                        ModuleState& shared = ModuleState::ofThisThread(),
-                        QWidget* parent = nullptr);
+    CardWidget(const CardServices& services, ModuleState& shared, QWidget* parent = nullptr);
     ~CardWidget() override;
 
     Card& card() { return *card_; }

@@ -141,10 +141,10 @@ void ControlBinder::user(const std::function<void()>& step) {
 // every refresh; it stops once the binder is gone.
 void ControlBinder::follow(Signal<>& changed, std::function<void()> refresher) {
     refresher();
-    changed.connect([alive = alive_, refresher] {
+    connections_.push_back(changed.connect([alive = alive_, refresher] {
         if (*alive)
             refresher();
-    });
+    }));
     refreshers_.push_back(std::move(refresher));
 }
 
@@ -339,10 +339,10 @@ QWidget* ControlBinder::makeLabel(Control* label, const ControlDesign& design) {
         // at once, before the handler's long work.
         auto show = [text, label] { text->setText(ToQString(label->Caption())); };
         follow(label->captionChanged, show);
-        label->captionChanged.connect([alive = alive_, text] {
+        connections_.push_back(label->captionChanged.connect([alive = alive_, text] {
             if (*alive && text->isVisible())
                 text->repaint();
-        });
+        }));
         text->installEventFilter(this);
     }
     return text;

@@ -79,6 +79,7 @@ private:
     std::map<std::string, QWidget*> widgets_;
     std::map<const QObject*, std::string> names_;
     std::vector<std::function<void()>> refreshers_;
+    std::vector<Connection> connections_; // to the models, dropped with the binder
     const QObject* doubleClicked_ = nullptr;
     int syncing_ = 0;
 };

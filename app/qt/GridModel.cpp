@@ -8,7 +8,7 @@ namespace dovrel {
 
 GridModel::GridModel(Grid& grid, bool editable, QObject* parent)
     : QAbstractTableModel(parent), grid_(grid), editable_(editable) {
-    grid_.changed.connect([this, alive = alive_] {
+    gridChanged_ = grid_.changed.connect([this, alive = alive_] {
         if (*alive)
             gridChanged();
     });

@@ -41,6 +41,7 @@ private:
     Grid& grid_;
     bool editable_;
     bool writing_ = false;
+    Connection gridChanged_;
 };
 
 } // namespace dovrel

@@ -11,7 +11,7 @@ ProgressWidget::ProgressWidget(Shape& frame, Shape& fill, QWidget* parent)
     : QWidget(parent), frame_(frame), fill_(fill) {
     setObjectName(QString::fromStdString(frame.name()));
     setAttribute(Qt::WA_OpaquePaintEvent);
-    fill_.changed.connect([this, alive = alive_] {
+    fillMoved_ = fill_.changed.connect([this, alive = alive_] {
         if (*alive)
             fillMoved();
     });

@@ -43,6 +43,7 @@ private:
     QElapsedTimer sinceRepaint_;
     bool scanning_ = false;
     int paintCount_ = 0;
+    Connection fillMoved_;
 };
 
 } // namespace dovrel

@@ -55,7 +55,8 @@ int main(int argc, char* argv[]) {
     CardServices services{messages, settings, forms, clipboard, browser, clock};
 
     QMainWindow window;
-    auto* card = new CardWidget(services);
+    ModuleState state;
+    auto* card = new CardWidget(services, state);
     window.setCentralWidget(card);
     window.setWindowTitle(ToQString(FromUtf8("דוברל")));
     messages.setParent(&window);

@@ -35,7 +35,7 @@ TEST_F(ScanTest, TheProgressBarRepaintsAtMostThirtyTimesASecond) {
     // Every move of the fill takes a little time, as on a slow disk, so the
     // scan lasts long enough for several repaints.
     int moves = 0;
-    card().ProgressFill.changed.connect([&] {
+    Connection watching = card().ProgressFill.changed.connect([&] {
         ++moves;
         QThread::usleep(100);
     });
@@ -59,7 +59,7 @@ TEST_F(ScanTest, InputDuringAScanWaitsUntilItEnds) {
     ASSERT_EQ(reference(), "1");
     bool clicked = false;
     int32_t positionAtClick = 0;
-    card().ProgressFill.changed.connect([&] {
+    Connection watching = card().ProgressFill.changed.connect([&] {
         if (clicked || card().ProgressFill.Width() == 0)
             return;
         clicked = true;
@@ -88,7 +88,7 @@ TEST_F(ScanTest, AListLeftDuringAScanHearsOfItAfterTheScan) {
     card().PubSearchValue = Variant(W("אחרון"));
     bool clicked = false;
     std::string searchAfterClick;
-    card().ProgressFill.changed.connect([&] {
+    Connection watching = card().ProgressFill.changed.connect([&] {
         if (clicked || card().ProgressFill.Width() == 0)
             return;
         clicked = true;
