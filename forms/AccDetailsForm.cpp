@@ -4,9 +4,9 @@
 #include "forms/FormDesigns.h"
 #include "forms/FormHost.h"
 #include "platform/Clipboard.h"
-#include "platform/Messages.h"
 #include "platform/Encoding.h"
 #include "platform/Error.h"
+#include "platform/Messages.h"
 
 namespace dovrel {
 
@@ -63,7 +63,7 @@ void AccDetailsForm::cmdCopyText_Click(int16_t Index) {
         text = box.Text();
     if (text.empty()) {
         host_->formMessages().show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("שגיאה"),
-                                        FromUtf8("לא נמצא טקסט להעתקה"));
+                                   FromUtf8("לא נמצא טקסט להעתקה"));
         return;
     }
     // A clipboard that another program holds must not keep the window open.

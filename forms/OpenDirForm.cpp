@@ -1,10 +1,10 @@
 #include "forms/OpenDirForm.h"
 
-#include "forms/FormHost.h"
-#include "platform/Messages.h"
 #include "forms/FormDesigns.h"
+#include "forms/FormHost.h"
 #include "platform/Encoding.h"
 #include "platform/Error.h"
+#include "platform/Messages.h"
 
 namespace dovrel {
 
@@ -19,8 +19,8 @@ constexpr const char* kScanDone = "הסריקה הסתיימה. תקתוק כפ�
 OpenDirForm::OpenDirForm(FormHost& host) : OpenDirForm(host, SystemMountPoints()) {}
 
 OpenDirForm::OpenDirForm(FormHost& host, std::vector<std::string> drives)
-    : Form("frmOpenDir"), PathDrive("PathDrive", std::move(drives)), compDir_(host.companyDirectory()),
-      host_(&host) {
+    : Form("frmOpenDir"), PathDrive("PathDrive", std::move(drives)),
+      compDir_(host.companyDirectory()), host_(&host) {
     for (Control* control :
          std::initializer_list<Control*>{&Label1, &PathDrive, &MainDir, &cmdFindWizComp,
                                          &cmbCompany, &Msg1, &CancelButton, &OKButton}) {

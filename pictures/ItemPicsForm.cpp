@@ -162,8 +162,8 @@ int32_t ItemPicsForm::RowRangeID(int32_t row) const {
 
 void ItemPicsForm::SetGetMoreParams(uint8_t Action) {
     for (const Setting& setting : kSettings)
-        BindSetting(host().settingsStore(), Action, host().settingsName(), "Params", setting.key, this->*setting.box, 1,
-                              Variant(FromUtf8(setting.defaultUtf8)));
+        BindSetting(host().settingsStore(), Action, host().settingsName(), "Params", setting.key,
+                    this->*setting.box, 1, Variant(FromUtf8(setting.defaultUtf8)));
 }
 
 bool ItemPicsForm::CheckDBFile() {

@@ -39,16 +39,15 @@ void WriteProperty(Control& control, uint8_t kind, const std::string& text) {
 
 } // namespace
 
-void BindSetting(SettingsStore& store, uint8_t Action, const std::string& AppName, const std::string& Section,
-                          const std::string& Key, Control& Ctl, uint8_t Kind,
-                          const Variant& Default) {
+void BindSetting(SettingsStore& store, uint8_t Action, const std::string& AppName,
+                 const std::string& Section, const std::string& Key, Control& Ctl, uint8_t Kind,
+                 const Variant& Default) {
     if (Kind < kText || Kind > kValue)
         return;
     if (Action == 1)
         store.SaveSetting(AppName, Section, Key, ReadProperty(Ctl, Kind));
     else if (Action == 2)
-        WriteProperty(Ctl, Kind,
-                      store.GetSetting(AppName, Section, Key, Default.toText()));
+        WriteProperty(Ctl, Kind, store.GetSetting(AppName, Section, Key, Default.toText()));
 }
 
 } // namespace dovrel

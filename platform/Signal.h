@@ -34,11 +34,11 @@ public:
     [[nodiscard]] Connection connect(Slot slot) {
         auto entry = std::make_shared<Entry>(Entry{std::move(slot), true});
         state_->entries.push_back(entry);
-        return Connection([state = std::weak_ptr<State>(state_),
-                           entry = std::weak_ptr<Entry>(entry)] {
-            if (auto kept = state.lock())
-                kept->remove(entry.lock());
-        });
+        return Connection(
+            [state = std::weak_ptr<State>(state_), entry = std::weak_ptr<Entry>(entry)] {
+                if (auto kept = state.lock())
+                    kept->remove(entry.lock());
+            });
     }
 
     void operator()(Args... args) const {

@@ -5,6 +5,7 @@
 #include "ChildFailure.h"
 #include "TestCompany.h"
 #include "fixfiles/CurrentDocument.h"
+#include "pictures/PictureCache.h"
 #include "pictures/PictureCollation.h"
 #include "pictures/PictureLookup.h"
 #include "platform/Error.h"
@@ -66,7 +67,7 @@ protected:
             doc.lines[i + 1].itemKey = W(lines[i].first);
             doc.lines[i + 1].catCode = W(lines[i].second);
         }
-        FillPictures(dbName(), doc);
+        FillPictures(dbName(), doc, cache);
         std::vector<std::string> shown;
         for (size_t i = 1; i <= lines.size(); ++i) {
             EXPECT_EQ(doc.lines[i].picFile.size(), 50u);
@@ -93,6 +94,7 @@ protected:
     test::TempDir dir;
     std::filesystem::path file = dir.path() / "Dovrel.def";
     PictureDb db{FromUtf8(file.string())};
+    PictureCache cache;
 };
 
 TEST(PictureCollationTest, OrdersSpaceDigitsLatinHebrewIgnoringCase) {
@@ -179,21 +181,21 @@ TEST_F(PictureDbTest, TheLookupLeavesLinesAloneWithoutDatabaseOrRangeAndFailsOnA
     doc.lineCount = 2;
     doc.lines[1].catCode = "001";
     doc.lines[1].picFile = "old.jpg" + std::string(43, ' ');
-    FillPictures(dbName(), doc); // no file: nothing happens
+    FillPictures(dbName(), doc, cache); // no file: nothing happens
     EXPECT_EQ(doc.lines[1].picFile.substr(0, 7), "old.jpg");
     db.create(false);
     db.replaceAll({R("x", "y", {}, {}, "xy.jpg")});
-    FillPictures(dbName(), doc);
+    FillPictures(dbName(), doc, cache);
     EXPECT_EQ(doc.lines[1].picFile.substr(0, 7), "old.jpg");
 
     db.replaceAll({R({}, {}, {}, {}, std::string(50, 'p'))});
-    FillPictures(dbName(), doc);
+    FillPictures(dbName(), doc, cache);
     EXPECT_EQ(doc.lines[1].picFile, std::string(50, 'p'));
     EXPECT_EQ(doc.lines[2].picFile, std::string(50, ' ')); // no code, no picture
 
     db.replaceAll({R({}, {}, {}, {}, "p")});
     otherProgram("UPDATE tItemPicture SET PicFile = NULL");
-    EXPECT_THAT(FailureOf([&] { FillPictures(dbName(), doc); }),
+    EXPECT_THAT(FailureOf([&] { FillPictures(dbName(), doc, cache); }),
                 HasSubstr("The picture range 1 has no picture file"));
 }
 
@@ -315,7 +317,7 @@ TEST_F(PictureDbTest, AFileThatIsNotAPictureDatabaseIsNamedAndKept) {
     std::filesystem::remove(file);
     otherProgram("CREATE TABLE other (x)");
     EXPECT_EQ(db.inspect().reason, "it has no table tItemPicture");
-    EXPECT_THAT(FailureOf([&] { FillPictures(dbName(), *std::make_unique<CurrentDocument>()); }),
+    EXPECT_THAT(FailureOf([&] { FillPictures(dbName(), *std::make_unique<CurrentDocument>(), cache); }),
                 HasSubstr("it has no table tItemPicture"));
 }
 

@@ -1,5 +1,6 @@
 #include "QtHost.h"
 
+#include "forms/AccDetailsForm.h"
 #include "forms/OpenDirForm.h"
 
 #include <QComboBox>
@@ -79,6 +80,22 @@ TEST_F(FormDialogTest, AccountDetailsCopyTheSelectionOrTheWholeBox) {
     ASSERT_EQ(boxes.size(), 1u);
     EXPECT_EQ(boxes[0].title, Q("שגיאה"));
     EXPECT_EQ(boxes[0].text, Q("לא נמצא טקסט להעתקה"));
+}
+
+TEST_F(FormDialogTest, AClosedDialogLeavesNoListenerOnTheForm) {
+    TestCompany company(json{{"accounts", {{{"key", "1001"}, {"phone", "03"}}}}}.dump());
+    card().txtCompPath.setText(company.compPath());
+    retype(find<QLineEdit>("txtAccountKey"), "1001");
+    auto listeners = [this] {
+        auto& form = dynamic_cast<AccDetailsForm&>(*state.Forms.at("frmAccDetails"));
+        return form.txtPhone.changed.slotCount() + form.Label1.captionChanged.slotCount();
+    };
+    size_t whileShown = 0;
+    open("cmdAccount", [&](FormDialog&) { whileShown = listeners(); });
+    size_t afterFirst = listeners();
+    EXPECT_GT(whileShown, afterFirst);
+    open("cmdAccount", [&](FormDialog&) { EXPECT_EQ(listeners(), whileShown); });
+    EXPECT_EQ(listeners(), afterFirst);
 }
 
 TEST_F(FormDialogTest, TheCompanyChooserScansTheChosenDirectoryAndReturnsTheCompany) {
