@@ -317,8 +317,9 @@ TEST_F(PictureDbTest, AFileThatIsNotAPictureDatabaseIsNamedAndKept) {
     std::filesystem::remove(file);
     otherProgram("CREATE TABLE other (x)");
     EXPECT_EQ(db.inspect().reason, "it has no table tItemPicture");
-    EXPECT_THAT(FailureOf([&] { FillPictures(dbName(), *std::make_unique<CurrentDocument>(), cache); }),
-                HasSubstr("it has no table tItemPicture"));
+    EXPECT_THAT(
+        FailureOf([&] { FillPictures(dbName(), *std::make_unique<CurrentDocument>(), cache); }),
+        HasSubstr("it has no table tItemPicture"));
 }
 
 TEST_F(PictureDbTest, ADamagedFileIsAnErrorUntilReCreated) {
