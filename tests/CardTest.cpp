@@ -1,5 +1,5 @@
 // The viewer control as a host and a user drive it: start-up, members,
-// navigation, searches, resets, settings and two controls on one thread.
+// navigation, searches, resets, settings and two controls on one thread or on two.
 
 #include "control/Card.h"
 #include "TestCompany.h"
@@ -15,6 +15,7 @@
 #include <map>
 #include <set>
 #include <sstream>
+#include <thread>
 #include <tuple>
 #include <utility>
 
@@ -399,6 +400,32 @@ TEST_F(CardTest, TwoControlsShareTheCompanyButNotTheirPositions) {
     second->SetCompDir(Variant(other.compPath()));
     EXPECT_EQ(first->PubACTLocation, 8);
     walk(*first, "FirstButt=900");
+}
+
+// Each thread makes its own module state: controls showing documents on two
+// threads at once see what each sees alone.
+TEST_F(CardTest, TwoControlsOnTwoThreadsKeepTheirOwnState) {
+    auto work = [this](int16_t type, std::string& reference) {
+        RecordedMessages own;
+        ModuleState state;
+        Card card(own, state);
+        card.UserControl_InitProperties(nullptr);
+        for (int round = 0; round < 50; ++round) {
+            int32_t start = 2;
+            EXPECT_EQ(card.ShowDoc(company.compPath(), type, start), 0);
+        }
+        reference = shown(card);
+        EXPECT_TRUE(own.shown().empty());
+    };
+    std::string alone20, alone21, delivery, agent;
+    work(20, alone20);
+    work(21, alone21);
+    ASSERT_NE(alone20, alone21);
+    std::thread first(work, 20, std::ref(delivery)), second(work, 21, std::ref(agent));
+    first.join();
+    second.join();
+    EXPECT_EQ(delivery, alone20);
+    EXPECT_EQ(agent, alone21);
 }
 
 } // namespace
