@@ -12,9 +12,9 @@
 
 namespace dovrel {
 
-PageContext::PageContext(const PageView& view, const CurrentDocument& doc,
-                         const PageSettings& settings, CivilDate today, int16_t mode)
-    : view(view), doc(doc), settings(settings), today(today), mode(mode) {
+PageContext::PageContext(const PageView& pageView, const CurrentDocument& document,
+                         const PageSettings& pageSettings, CivilDate pageDay, int16_t pageMode)
+    : view(pageView), doc(document), settings(pageSettings), today(pageDay), mode(pageMode) {
     int count = std::clamp<int>(doc.lineCount, 0, kMaxDocLines);
     for (int i = 1; i <= count; ++i)
         lineKeys.push_back(Trim(doc.lines[static_cast<size_t>(i)].itemKey));

@@ -82,7 +82,7 @@ private:
         }
     };
     struct Raising {
-        explicit Raising(State& state) : state(state) { ++state.raising; }
+        explicit Raising(State& raised) : state(raised) { ++state.raising; }
         ~Raising() {
             if (--state.raising == 0)
                 state.purge();
