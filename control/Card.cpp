@@ -3,6 +3,7 @@
 #include "control/CardForms.h"
 #include "control/Surface.h"
 #include "fixfiles/AccountsFile.h"
+#include "fixfiles/CompanyFile.h"
 #include "fixfiles/ItemsFile.h"
 #include "fixfiles/ReadStock.h"
 #include "fixfiles/TextDecoding.h"
@@ -159,10 +160,14 @@ void Card::InitCmbDocType() {
 
 int32_t Card::ReadStock(std::string pCompPath, int16_t& pWizFile, std::string& pSearchBy,
                         Variant& pSearchValue, std::string& pStartFrom, std::string& pFromDate) {
+    // The company's own currency names are shown from the first document on,
+    // not only after a print; a missing or short adf.fix leaves them as they were.
+    Path compPath = shared_.Paths.native(pCompPath);
+    LoadCompany(compPath, shared_.Company);
     StockContext context{shared_.DocTypes, shared_.DocFiles, shared_.Company, shared_.Doc,
                          services_.messages};
-    return dovrel::ReadStock(*this, context, shared_.Paths.native(pCompPath), pWizFile, pSearchBy,
-                             pSearchValue, pStartFrom, pFromDate);
+    return dovrel::ReadStock(*this, context, compPath, pWizFile, pSearchBy, pSearchValue,
+                             pStartFrom, pFromDate);
 }
 
 Variant Card::CompanyTitle() const {
@@ -218,8 +223,10 @@ void Card::PicPath(const Variant& value) {
 }
 
 Variant Card::ReadITM(std::string& CompPath) {
-    return dovrel::ReadITM(shared_.Paths.native(CompPath), shared_.Doc,
-                           {ProgressFrame, ProgressFill});
+    Variant read =
+        dovrel::ReadITM(shared_.Paths.native(CompPath), shared_.Doc, {ProgressFrame, ProgressFill});
+    takeCategoryCodes(shared_.Doc);
+    return read;
 }
 
 Variant Card::ReadACT(std::string& CompPath) {

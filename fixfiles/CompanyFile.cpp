@@ -4,6 +4,8 @@
 #include "platform/Error.h"
 #include "platform/FileSystem.h"
 
+#include <sys/stat.h>
+
 namespace dovrel {
 
 void CompanyRecord::setTitle(std::string_view title) {
@@ -25,20 +27,61 @@ std::string CompanyRecord::currencyName(int index) const {
     return name;
 }
 
+std::optional<FileStamp> StampOf(const Path& path) {
+    struct stat st {};
+    if (::stat(path.c_str(), &st) != 0)
+        return std::nullopt;
+    return FileStamp{path,
+                     static_cast<uint64_t>(st.st_dev),
+                     static_cast<uint64_t>(st.st_ino),
+                     static_cast<int64_t>(st.st_size),
+                     static_cast<int64_t>(st.st_mtim.tv_sec),
+                     static_cast<int64_t>(st.st_mtim.tv_nsec)};
+}
+
+namespace {
+
+// The file system's name of the company's adf.fix; none when there is none.
+std::optional<Path> AdfPath(const Path& pCompPath) {
+    Path path = pCompPath.plus("\\adf.fix");
+    if (!FileExists(path))
+        return std::nullopt;
+    return ResolvePath(path);
+}
+
+} // namespace
+
 bool ReadAdf(const Path& pCompPath, CompanyRecord& company) {
     try {
-        Path path = pCompPath.plus("\\adf.fix");
-        if (!FileExists(path))
+        std::optional<Path> path = AdfPath(pCompPath);
+        if (!path)
             return false;
-        RecordFile file(ResolvePath(path), kAdfRecordLength);
+        // Taken before the read: a change made during it shows at the next look.
+        std::optional<FileStamp> stamp = StampOf(*path);
+        RecordFile file(*path, kAdfRecordLength);
         const unsigned char* record = file.record(1);
         if (record == nullptr)
             return false;
         company.bytes.assign(reinterpret_cast<const char*>(record), kAdfRecordLength);
+        company.source = stamp;
         return true;
     } catch (...) {
         return false;
     }
+}
+
+bool LoadCompany(const Path& pCompPath, CompanyRecord& company) {
+    try {
+        std::optional<Path> path = AdfPath(pCompPath);
+        if (!path)
+            return false;
+        std::optional<FileStamp> stamp = StampOf(*path);
+        if (stamp && company.source == stamp)
+            return true;
+    } catch (...) {
+        return false;
+    }
+    return ReadAdf(pCompPath, company);
 }
 
 } // namespace dovrel

@@ -1,11 +1,15 @@
 #pragma once
 
+#include "fixfiles/Document.h"
 #include "platform/Controls.h"
 #include "platform/Grid.h"
 #include "platform/Variant.h"
 
 #include <cstdint>
+#include <optional>
 #include <string>
+#include <utility>
+#include <vector>
 
 namespace dovrel {
 
@@ -22,6 +26,24 @@ public:
     // Resets the lines grid: the heading row and one empty row, eight
     // columns, every column right-aligned.
     void InitDocLines();
+
+    // Shows a document the reader accepted: its lines in the grid, its header
+    // and totals in the boxes. It is kept as the document shown.
+    void showDocument(Document document);
+    // Shows that nothing was found: empty boxes and grid, no document.
+    void showNothing();
+    // The last document shown; none before the first and after a walk that
+    // found nothing.
+    const std::optional<Document>& document() const { return document_; }
+    // Gives the lines of the document shown the category codes that the
+    // items file put into the current document, by item key.
+    void takeCategoryCodes(const CurrentDocument& current);
+
+    using BoxText = std::pair<TextBox DocumentView::*, std::string>;
+    // The header boxes with the texts a document (or none) puts into them.
+    static std::vector<BoxText> HeaderTexts(const Document* document);
+    // Fills a lines grid as the control shows a document (or none).
+    static void FillLines(Grid& grid, const Document* document);
 
     int32_t PubACTLocation = 2;
     int32_t PubPrevLocation = 0;
@@ -45,6 +67,11 @@ public:
     Grid DocLines{"DocLines"};
     Shape ProgressFrame{"ProgressFrame", 3720, 4680, 3015, 495};
     Shape ProgressFill{"ProgressFill", 3720, 4680, 0, 495};
+
+private:
+    static void InitLines(Grid& grid);
+
+    std::optional<Document> document_;
 };
 
 } // namespace dovrel

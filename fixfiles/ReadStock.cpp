@@ -2,7 +2,6 @@
 
 #include "fixfiles/DateSerial.h"
 #include "fixfiles/FieldPrefilter.h"
-#include "fixfiles/Formats.h"
 #include "fixfiles/ProgressBar.h"
 #include "fixfiles/RecordFields.h"
 #include "fixfiles/RecordFile.h"
@@ -11,11 +10,13 @@
 #include "platform/Error.h"
 #include "platform/FileSystem.h"
 
+#include <algorithm>
 #include <array>
 #include <cmath>
 #include <cstring>
 #include <limits>
 #include <optional>
+#include <vector>
 
 namespace dovrel {
 namespace {
@@ -26,11 +27,6 @@ double Checked(double value) {
     if (!std::isfinite(value))
         throw Error("Overflow");
     return value;
-}
-
-std::string FixedWidth(std::string text, size_t width) {
-    text.resize(width, ' ');
-    return text;
 }
 
 enum class SearchBy { None, AccountKey, Reference1, CustomerName, ItemKey, Details };
@@ -54,6 +50,13 @@ struct Walk {
     int step = 1;
 };
 
+StockRead Ended(StockRead::Outcome outcome, int32_t stoppedAt = 0) {
+    StockRead read;
+    read.outcome = outcome;
+    read.stoppedAt = stoppedAt;
+    return read;
+}
+
 // One read: the walk over the document file and the loading of the document
 // it finds. Documents and lines are copied out of the file's block before they
 // are decoded further, since the next record read may replace the block.
@@ -67,8 +70,8 @@ public:
         : view_(view), ctx_(context), searchBy_(ParseSearchBy(pSearchBy)),
           searchValue_(pSearchValue), progress_{view.ProgressFrame, view.ProgressFill} {}
 
-    int32_t run(const Path& pCompPath, int16_t pWizFile, const std::string& pStartFrom,
-                const std::string& pFromDate);
+    StockRead run(const Path& pCompPath, int16_t pWizFile, const std::string& pStartFrom,
+                  const std::string& pFromDate);
 
 private:
     struct Candidate {
@@ -81,9 +84,7 @@ private:
     bool passesHeader(const unsigned char* h, bool& matched);
     bool lineMatches(const unsigned char* rec);
     void processLine(const unsigned char* rec, uint8_t docType, bool& matched);
-    void startGrid();
     void accept(const Record& header, const Record& cont, const Date& date);
-    void nothingFound();
     const std::string& searchText();
     const FieldPrefilter& filterFor(std::optional<FieldPrefilter>& filter, const std::string& text);
 
@@ -97,11 +98,13 @@ private:
     ProgressBar progress_;
     std::optional<Date> fromDate_;
     uint8_t code_ = 0;
+    Path file_;
     // The document being loaded.
     int accepted_ = 0;
-    bool gridStarted_ = false;
+    std::vector<Document::Line> lines_;
     double factor_ = 1;
     double foreignSum_ = 0;
+    std::optional<Document> found_;
 };
 
 const std::string& StockScan::searchText() {
@@ -144,8 +147,51 @@ std::string AccountKeyOf(const unsigned char* header) {
     return TrimCopy(LogicalText(Field(header, 2, 8)));
 }
 
-int32_t StockScan::run(const Path& pCompPath, int16_t pWizFile, const std::string& pStartFrom,
-                       const std::string& pFromDate) {
+// A text field as stored (trimmed) and as the control shows it.
+DocumentText TextOf(std::string_view field) {
+    return {MappedLetters(Trim(field)), TrimCopy(LogicalText(field))};
+}
+
+// The company's title and currency names; bytes of code 0 (a record never
+// read) count as spaces.
+void TakeCompany(Document& doc, const CompanyRecord& company) {
+    auto blank = [](std::string text) {
+        std::replace(text.begin(), text.end(), '\0', ' ');
+        return text;
+    };
+    doc.companyTitle = TextOf(blank(company.title()));
+    for (size_t i = 0; i < doc.currencyNames.size(); ++i) {
+        auto code = static_cast<int16_t>(10 + i);
+        doc.currencyNames[i] = {MappedLetters(Trim(blank(company.currencyName(code - 9)))),
+                                CurrencyNames(code, company).first};
+    }
+}
+
+// One line record. The amounts of a text-only line are not examined.
+Document::Line LineOf(const unsigned char* rec, const CompanyRecord& company) {
+    Document::Line line;
+    line.lineNumber = rec[162];
+    line.textOnly = Trim(Field(rec, 1, 12)) == "*";
+    line.itemKey = TextOf(Field(rec, 1, 12));
+    line.description = TextOf(Field(rec, 13, 40));
+    line.details = TextOf(Trim(Field(rec, 64, 8)));
+    if (line.textOnly)
+        return line;
+    // Checked here, so that showing the line cannot fail.
+    line.quantity = Checked(DoubleAt(rec, 124));
+    line.price = Checked(DoubleAt(rec, 108));
+    line.total = Checked(DoubleAt(rec, 116));
+    line.currency = rec[72];
+    line.currencyName = CurrencyNames(line.currency, company).first;
+    line.discount = Int16At(rec, 156) / 100.0;
+    if (!line.itemKey.logical.empty() && (line.lineNumber < 1 || line.lineNumber > kMaxDocLines))
+        throw Error("Line number " + std::to_string(line.lineNumber) + " is outside 1 to " +
+                    std::to_string(kMaxDocLines));
+    return line;
+}
+
+StockRead StockScan::run(const Path& pCompPath, int16_t pWizFile, const std::string& pStartFrom,
+                         const std::string& pFromDate) {
     if (pWizFile < 0 || pWizFile >= kDocTypeRows)
         throw Error("Document type row " + std::to_string(pWizFile) + " is outside the table");
     const DocTypeRow& row = ctx_.docTypes[static_cast<size_t>(pWizFile)];
@@ -154,17 +200,15 @@ int32_t StockScan::run(const Path& pCompPath, int16_t pWizFile, const std::strin
     bool hasFile = row.fileNumber >= 1 && row.fileNumber <= 4;
     Path path =
         hasFile ? pCompPath.plus(ctx_.docFiles[static_cast<size_t>(row.fileNumber)]) : Path();
-    if (!hasFile || !FileExists(path)) {
-        ctx_.messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("שגיאה"),
-                           FromUtf8("קבצי מסמכים לא נמצאו"));
-        return 0;
-    }
+    if (!hasFile || !FileExists(path))
+        return Ended(StockRead::Outcome::FileMissing);
     code_ = static_cast<uint8_t>(row.code);
     ctx_.doc.clearLines();
     if (pFromDate.size() >= 6)
         fromDate_ = TextToDate(pFromDate);
 
-    RecordFile file(ResolvePath(path), kDocRecordLength);
+    file_ = ResolvePath(path);
+    RecordFile file(file_, kDocRecordLength);
     double exact = static_cast<double>(file.length()) / kDocRecordLength;
     auto records = static_cast<int64_t>(std::nearbyint(exact));
     if (records > std::numeric_limits<int32_t>::max() - 1024)
@@ -193,12 +237,11 @@ int32_t StockScan::run(const Path& pCompPath, int16_t pWizFile, const std::strin
             progress_.show(std::min(p, records), records);
         p += walk.step;
     }
-    if (!found)
-        nothingFound();
-    progress_.reset();
-    if (found)
-        ctx_.doc.lineCount = static_cast<int16_t>(accepted_);
-    return static_cast<int32_t>(p);
+    ctx_.doc.lineCount = static_cast<int16_t>(found ? accepted_ : 0);
+    StockRead read = Ended(found ? StockRead::Outcome::Found : StockRead::Outcome::NotFound,
+                           static_cast<int32_t>(p));
+    read.document = std::move(found_);
+    return read;
 }
 
 Walk StockScan::planWalk(const std::string& direction, int64_t records) {
@@ -245,10 +288,7 @@ StockScan::Candidate StockScan::tryDocument(RecordFile& file, const unsigned cha
     if (fromDate_ && DateOf(cont) < *fromDate_)
         return {false, at + 1};
 
-    // The grid is reset when the document shows its first line or is
-    // accepted: most documents a search tries are rejected, and resetting
-    // the grid for each would cost more than testing them.
-    gridStarted_ = false;
+    lines_.clear();
     factor_ = (100 - DoubleAt(cont.data(), 112)) / 100;
     accepted_ = 0;
     foreignSum_ = 0;
@@ -304,12 +344,6 @@ bool StockScan::lineMatches(const unsigned char* rec) {
     return false;
 }
 
-void StockScan::startGrid() {
-    if (!gridStarted_)
-        view_.InitDocLines();
-    gridStarted_ = true;
-}
-
 void StockScan::processLine(const unsigned char* rec, uint8_t docType, bool& matched) {
     if (rec[93] != docType || IsHiddenLine(rec))
         return;
@@ -317,111 +351,91 @@ void StockScan::processLine(const unsigned char* rec, uint8_t docType, bool& mat
         matched = lineMatches(rec);
     if (!matched)
         return;
-    std::string_view rawKey = Trim(Field(rec, 1, 12));
-    std::string itemKey = TrimCopy(LogicalText(Field(rec, 1, 12)));
-    std::string details = TrimCopy(LogicalText(Trim(Field(rec, 64, 8))));
-
     if (++accepted_ > kMaxDocLines)
         throw Error("The document has more than " + std::to_string(kMaxDocLines) + " lines");
-    DocumentLine& line = ctx_.doc.lines[static_cast<size_t>(accepted_)];
-    std::string_view description = Trim(Field(rec, 13, 40));
-    if (!description.empty())
-        line.descriptionVisual = VisualText(description);
-
-    const std::string number = std::to_string(rec[162]);
-    const std::string descriptionText = TrimCopy(LogicalText(Field(rec, 13, 40)));
-    const char tab = '\t';
-    std::string row;
-    if (rawKey == "*") {
-        row = number + tab + tab + descriptionText + std::string(5, tab);
-    } else {
-        double price = DoubleAt(rec, 108);
-        double total = DoubleAt(rec, 116);
-        double quantity = DoubleAt(rec, 124);
-        uint8_t currency = rec[72];
-        row = number + tab + itemKey + tab + descriptionText + tab + details + tab +
-              PlainNumber(Checked(quantity)) + tab + FormatAmount(price) + tab +
-              CurrencyNames(currency, ctx_.company).first + tab + FormatAmount(total);
-        if (!itemKey.empty()) {
-            int lineNumber = rec[162];
-            if (lineNumber < 1 || lineNumber > kMaxDocLines)
-                throw Error("Line number " + std::to_string(lineNumber) + " is outside 1 to " +
-                            std::to_string(kMaxDocLines));
-            double discount = Int16At(rec, 156) / 100.0;
-            line.itemKey = FixedWidth(itemKey, 12);
-            ctx_.doc.amounts[static_cast<size_t>(lineNumber)] = {price, currency, quantity,
-                                                                 discount};
-            foreignSum_ = Checked(foreignSum_ + price * quantity * (100 - discount) / 100);
-        }
-    }
-    startGrid();
-    view_.DocLines.AddItem(row, accepted_);
+    Document::Line line = LineOf(rec, ctx_.company);
+    if (!line.textOnly && !line.itemKey.logical.empty())
+        foreignSum_ =
+            Checked(foreignSum_ + line.price * line.quantity * (100 - line.discount) / 100);
+    StoreLine(ctx_.doc, static_cast<size_t>(accepted_), line);
+    lines_.push_back(std::move(line));
 }
 
 void StockScan::accept(const Record& header, const Record& cont, const Date& date) {
     const unsigned char* h = header.data();
     const unsigned char* c = cont.data();
-    double discount = DoubleAt(c, 112);
-    double before = DoubleAt(c, 154);
-    // Everything is formatted before any box changes, so a damaged amount
-    // leaves the boxes as they were.
-    std::string totalVat = FormatAmount(before * factor_);
-    std::string vatValue = FormatAmount(before * factor_ * DoubleAt(c, 128) / 100);
-    std::string total1 = FormatAmount(DoubleAt(c, 120));
-    double foreignTotal = std::fabs(discount) >= 0.01 ? foreignSum_ * factor_ : foreignSum_;
-    startGrid();
-
-    view_.txtAccountKey.setText(TrimCopy(LogicalText(Field(h, 2, 8))));
-    view_.txtReference1.setText(TrimCopy(Field(h, 100, 5)));
-    view_.txtCustomerName.setText(TrimCopy(LogicalText(Field(h, 10, 30))));
-    view_.txtDate.setText(FormatDate(date));
-    view_.txtAddress1.setText(TrimCopy(LogicalText(Field(h, 40, 30))));
-    view_.txtAddress2.setText(TrimCopy(LogicalText(Field(h, 70, 30))));
-    view_.txtTotalVat.setText(totalVat);
-    view_.txtVatValue.setText(vatValue);
-    view_.txtTotal1.setText(total1);
-
-    DocumentHeader& dh = ctx_.doc.header;
-    dh.type = h[1];
-    dh.totalBeforeDiscount = before;
-    dh.foreignTotal = foreignTotal;
-    dh.discountPercent = discount;
+    Document doc;
+    doc.type = h[1];
+    doc.file = file_;
+    doc.record = view_.PubACTLocation;
+    doc.accountKey = TextOf(Field(h, 2, 8));
+    doc.reference = {MappedLetters(Trim(Field(h, 100, 5))), TrimCopy(Field(h, 100, 5))};
+    doc.customer = TextOf(Field(h, 10, 30));
+    doc.address1 = TextOf(Field(h, 40, 30));
+    doc.address2 = TextOf(Field(h, 70, 30));
+    doc.date = date;
     const std::string_view remarks[3] = {Trim(Field(h, 110, 48)), Trim(Field(c, 5, 48)),
                                          Trim(Field(c, 53, 48))};
-    for (size_t i = 0; i < 3; ++i) {
-        dh.remarksLogical[i] = LogicalText(remarks[i]);
-        dh.remarksVisual[i] = VisualText(remarks[i]);
-    }
-    dh.customerVisual = VisualText(Trim(Field(h, 10, 30)));
-    dh.address1Visual = VisualText(Trim(Field(h, 40, 30)));
-    dh.address2Visual = VisualText(Trim(Field(h, 70, 30)));
-    dh.warehouse = c[138];
-    view_.PubPrevLocation = view_.PubACTLocation;
-}
+    for (size_t i = 0; i < 3; ++i)
+        doc.remarks[i] = {MappedLetters(remarks[i]), LogicalText(remarks[i])};
+    doc.warehouse = c[138];
+    doc.discountPercent = DoubleAt(c, 112);
+    doc.vatPercent = DoubleAt(c, 128);
+    // Checked before anything changes, so that a damaged amount leaves the
+    // current document as it was and showing the totals cannot fail.
+    Document::Totals& totals = doc.totals;
+    totals.beforeDiscount = DoubleAt(c, 154);
+    totals.beforeVat = Checked(totals.beforeDiscount * factor_);
+    totals.vat = Checked(totals.beforeDiscount * factor_ * doc.vatPercent / 100);
+    totals.withVat = Checked(DoubleAt(c, 120));
+    totals.foreign = std::fabs(doc.discountPercent) >= 0.01 ? foreignSum_ * factor_ : foreignSum_;
+    doc.lines = std::move(lines_);
+    TakeCompany(doc, ctx_.company);
 
-void StockScan::nothingFound() {
-    for (TextBox* box : {&view_.txtAccountKey, &view_.txtReference1, &view_.txtCustomerName,
-                         &view_.txtDate, &view_.txtAddress1, &view_.txtAddress2, &view_.txtTotalVat,
-                         &view_.txtVatValue, &view_.txtTotal1})
-        box->setText({});
-    view_.InitDocLines();
-    ctx_.doc.lineCount = 0;
+    StoreHeader(ctx_.doc.header, doc);
+    view_.PubPrevLocation = view_.PubACTLocation;
+    found_ = std::move(doc);
 }
 
 } // namespace
 
-int32_t ReadStock(DocumentView& view, const StockContext& context, const Path& pCompPath,
-                  int16_t pWizFile, const std::string& pSearchBy, const Variant& pSearchValue,
-                  const std::string& pStartFrom, const std::string& pFromDate) {
+StockRead WalkStock(DocumentView& view, const StockContext& context, const Path& pCompPath,
+                    int16_t pWizFile, const std::string& pSearchBy, const Variant& pSearchValue,
+                    const std::string& pStartFrom, const std::string& pFromDate) {
     try {
         StockScan scan(view, context, pSearchBy, pSearchValue);
         return scan.run(pCompPath, pWizFile, pStartFrom, pFromDate);
     } catch (const std::exception& e) {
+        StockRead failed = Ended(StockRead::Outcome::Failed);
+        failed.error = e.what();
+        return failed;
+    }
+}
+
+int32_t ReadStock(DocumentView& view, const StockContext& context, const Path& pCompPath,
+                  int16_t pWizFile, const std::string& pSearchBy, const Variant& pSearchValue,
+                  const std::string& pStartFrom, const std::string& pFromDate) {
+    StockRead read = WalkStock(view, context, pCompPath, pWizFile, pSearchBy, pSearchValue,
+                               pStartFrom, pFromDate);
+    switch (read.outcome) {
+    case StockRead::Outcome::Found:
+        view.showDocument(std::move(*read.document));
+        break;
+    case StockRead::Outcome::NotFound:
+        view.showNothing();
+        break;
+    case StockRead::Outcome::FileMissing:
+        context.messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("שגיאה"),
+                              FromUtf8("קבצי מסמכים לא נמצאו"));
+        return 0;
+    case StockRead::Outcome::Failed:
         view.ProgressFill.setWidth(0);
         context.messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("שגיאה"),
-                              FromUtf8(e.what()));
+                              FromUtf8(read.error));
         return 0;
     }
+    view.ProgressFill.setWidth(0);
+    return read.stoppedAt;
 }
 
 } // namespace dovrel

@@ -83,6 +83,14 @@ std::string VisualText(std::string_view text) {
     return result;
 }
 
+std::string MappedLetters(std::string_view text) {
+    std::string result(text);
+    for (char& c : result)
+        if (IsDosHebrew(static_cast<unsigned char>(c)))
+            c = ToWindowsHebrew(static_cast<unsigned char>(c));
+    return result;
+}
+
 char VisualChar(char c) {
     switch (c) {
     case '(':

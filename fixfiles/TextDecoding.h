@@ -20,6 +20,8 @@ struct CompanyRecord;
 std::string LogicalText(std::string_view text);
 // Keeps the stored order, maps the Hebrew letters and mirrors brackets.
 std::string VisualText(std::string_view text);
+// Keeps the stored order and every other byte; maps only the Hebrew letters.
+std::string MappedLetters(std::string_view text);
 char VisualChar(char c);
 
 // The Hebrew abbreviation and the printed code of a currency code. Codes 10

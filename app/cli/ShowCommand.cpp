@@ -1,8 +1,9 @@
 #include "app/cli/ShowCommand.h"
 
 #include "app/cli/StateJson.h"
-#include "fixfiles/CompanyFile.h"
+#include "fixfiles/DateSerial.h"
 #include "fixfiles/DocTypes.h"
+#include "fixfiles/Formats.h"
 #include "fixfiles/TextDecoding.h"
 #include "platform/Encoding.h"
 #include "platform/Error.h"
@@ -74,7 +75,7 @@ int ShowCommand::run(std::ostream& out, std::ostream& err) {
             << shared_.DocTypes[static_cast<size_t>(row_)].code << '\n';
     std::vector<RecordedMessages::Shown> shown = messages.take();
     if (options_.json)
-        out << StateJson::Dump(StateJson::Build(card), 2) << '\n';
+        out << StateJson::Dump(StateJson::BuildFromDocument(card), 2) << '\n';
     for (const auto& message : shown)
         err << "dovrel: " << ToTerminal(message.title) << ": " << ToTerminal(message.text) << '\n';
     if (!shown.empty())
@@ -84,12 +85,10 @@ int ShowCommand::run(std::ostream& out, std::ostream& err) {
     return 0;
 }
 
-// The control's own start-up and ShowDoc, with the company's record read
-// first so that its currency names are shown. The start-up's settings are
-// its defaults: what the user saved is neither read nor changed.
+// The control's own start-up and ShowDoc. The start-up's settings are its
+// defaults: what the user saved is neither read nor changed.
 void ShowCommand::read(Card& card) {
     card.UserControl_InitProperties(nullptr);
-    companyRead_ = ReadAdf(shared_.Paths.native(compPath_), shared_.Company);
     row_ = DocTypeIndex(shared_.DocTypes, options_.type);
     int16_t type = options_.type;
     int32_t start = options_.start;
@@ -109,37 +108,36 @@ void ShowCommand::watchProgress(Card& card) {
     });
 }
 
-void ShowCommand::printDocument(Card& card, std::ostream& out) const {
-    // The reader marks the document it accepts; nothing found is not an error.
-    if (card.PubPrevLocation == 0) {
+void ShowCommand::printDocument(const Card& card, std::ostream& out) const {
+    // Nothing found is not an error.
+    const std::optional<Document>& document = card.document();
+    if (!document) {
         out << kNoDocument << '\n';
         return;
     }
-    printHeader(card, out);
+    printHeader(*document, out);
     out << '\n';
-    printLines(card.DocLines, out);
+    Grid lines(card.DocLines.name());
+    DocumentView::FillLines(lines, &*document);
+    printLines(lines, out);
     out << '\n';
-    printTotals(card, out);
-    printRemarks(out);
+    printTotals(*document, out);
+    printRemarks(*document, out);
 }
 
-void ShowCommand::printHeader(Card& card, std::ostream& out) const {
-    if (companyRead_) {
-        std::string title = LogicalText(shared_.Company.title());
-        std::replace(title.begin(), title.end(), '\0', ' ');
-        if (!Trim(title).empty())
-            out << Utf8Trimmed(title) << "\n\n";
-    }
+void ShowCommand::printHeader(const Document& document, std::ostream& out) const {
+    if (!document.companyTitle.logical.empty())
+        out << ToTerminal(document.companyTitle.logical) << "\n\n";
     const DocTypeRow& type = shared_.DocTypes[static_cast<size_t>(row_)];
     std::vector<Field> fields = {
         {"סוג מסמך", ToTerminal(type.hebrewTitle) + " (" + std::to_string(type.code) + ")"},
-        {"אסמכתא", ToTerminal(card.txtReference1.Text())},
-        {"תאריך", ToTerminal(card.txtDate.Text())},
-        {"כרטיס", ToTerminal(card.txtAccountKey.Text())},
-        {"שם", ToTerminal(card.txtCustomerName.Text())},
-        {"כתובת", ToTerminal(card.txtAddress1.Text())}};
-    if (!card.txtAddress2.Text().empty())
-        fields.push_back({"", ToTerminal(card.txtAddress2.Text())});
+        {"אסמכתא", ToTerminal(document.reference.logical)},
+        {"תאריך", FormatDate(document.date)},
+        {"כרטיס", ToTerminal(document.accountKey.logical)},
+        {"שם", ToTerminal(document.customer.logical)},
+        {"כתובת", ToTerminal(document.address1.logical)}};
+    if (!document.address2.logical.empty())
+        fields.push_back({"", ToTerminal(document.address2.logical)});
     PrintFields(fields, out);
 }
 
@@ -173,18 +171,18 @@ void ShowCommand::printLines(const Grid& grid, std::ostream& out) const {
     }
 }
 
-void ShowCommand::printTotals(Card& card, std::ostream& out) const {
-    PrintFields({{"סה\"כ", ToTerminal(card.txtTotalVat.Text())},
-                 {"מע\"מ", ToTerminal(card.txtVatValue.Text())},
-                 {"סה\"כ כולל מע\"מ", ToTerminal(card.txtTotal1.Text())}},
+void ShowCommand::printTotals(const Document& document, std::ostream& out) const {
+    PrintFields({{"סה\"כ", FormatAmount(document.totals.beforeVat)},
+                 {"מע\"מ", FormatAmount(document.totals.vat)},
+                 {"סה\"כ כולל מע\"מ", FormatAmount(document.totals.withVat)}},
                 out);
 }
 
-void ShowCommand::printRemarks(std::ostream& out) const {
+void ShowCommand::printRemarks(const Document& document, std::ostream& out) const {
     std::vector<std::string> remarks;
-    for (const std::string& remark : shared_.Doc.header.remarksLogical)
-        if (!Trim(remark).empty())
-            remarks.push_back(Utf8Trimmed(remark));
+    for (const DocumentText& remark : document.remarks)
+        if (!Trim(remark.logical).empty())
+            remarks.push_back(Utf8Trimmed(remark.logical));
     if (remarks.empty())
         return;
     out << "\nהערות:\n";

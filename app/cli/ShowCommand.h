@@ -19,8 +19,8 @@ struct ShowOptions {
 };
 
 // `dovrel show`: reads the first document of a type at or after a record, as
-// the control's ShowDoc does, and prints it for a person (UTF-8, reading
-// order) or as the control's state in JSON.
+// the control's ShowDoc does, and prints the document the control shows for a
+// person (UTF-8, reading order) or as the control's state in JSON.
 class ShowCommand {
 public:
     ShowCommand(ShowOptions options, ModuleState& shared);
@@ -37,17 +37,16 @@ public:
 private:
     void read(Card& card);
     void watchProgress(Card& card);
-    void printDocument(Card& card, std::ostream& out) const;
-    void printHeader(Card& card, std::ostream& out) const;
+    void printDocument(const Card& card, std::ostream& out) const;
+    void printHeader(const Document& document, std::ostream& out) const;
     void printLines(const Grid& grid, std::ostream& out) const;
-    void printTotals(Card& card, std::ostream& out) const;
-    void printRemarks(std::ostream& out) const;
+    void printTotals(const Document& document, std::ostream& out) const;
+    void printRemarks(const Document& document, std::ostream& out) const;
 
     ShowOptions options_;
     ModuleState& shared_;
     std::string compPath_;
     int16_t row_ = 0;
-    bool companyRead_ = false;
     std::ostream* progress_ = nullptr;
     Connection progressShown_;
 };

@@ -33,6 +33,18 @@ json StateJson::Build(const Card& card) {
     return state;
 }
 
+json StateJson::BuildFromDocument(const Card& card) {
+    json state = Build(card);
+    const dovrel::Document* document = card.document() ? &*card.document() : nullptr;
+    for (const auto& [box, text] : DocumentView::HeaderTexts(document))
+        state["controls"][(card.*box).name()] = Text(text);
+    Grid lines(card.DocLines.name());
+    DocumentView::FillLines(lines, document);
+    state["grid"] = GridCells(lines);
+    state["doc"] = Document(document ? ToCurrentDocument(*document) : CurrentDocument());
+    return state;
+}
+
 // Every control but grids, whose cells are given on their own.
 json StateJson::Controls(const std::vector<Control*>& list) {
     json controls = json::object();

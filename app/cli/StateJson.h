@@ -19,6 +19,10 @@ namespace dovrel {
 class StateJson {
 public:
     static nlohmann::json Build(const Card& card);
+    // The same state, with what the document reader gives (the header boxes,
+    // the lines grid, the current document) made from the document the
+    // control shows instead of read from its controls.
+    static nlohmann::json BuildFromDocument(const Card& card);
 
     // The value of one control: the text of a text box, the position of a
     // list, the value of a check box, the width of a shape, the cells of a
