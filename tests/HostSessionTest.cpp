@@ -172,6 +172,15 @@ TEST_F(HostSessionTest, ReadsAnswerResultControlsGridDocumentAndAccounts) {
     fails({"ReadACT", path + "/nothing-here"}, "ACT.fix");
 }
 
+// The demo's import order is in the company's own currency (code 11): its
+// name shows from the first document on, before anything is printed.
+TEST_F(HostSessionTest, TheStateShowsTheCompanysCurrencyNameBeforeAnyPrint) {
+    json reply = ask({"call", "ShowDoc", DOVREL_DEMO_DIR, 35, 2});
+    ASSERT_EQ(reply["ok"], true) << reply;
+    EXPECT_EQ(reply["state"]["grid"][1][6], "יואן");
+    EXPECT_EQ(reply["messages"], json::array());
+}
+
 TEST_F(HostSessionTest, MissingDocumentFileAnswersTheMessageBoxOnce) {
     TestCompany company(R"({"company": {"title": "x"}})");
     ask({"set", "txtCustomerName", "קודם"});

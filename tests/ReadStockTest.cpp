@@ -1,5 +1,6 @@
 // The document reader over companies written by the sample-company writer.
 
+#include "fixfiles/ReadStock.h"
 #include "TestCompany.h"
 #include "control/Card.h"
 #include "fixfiles/DocTypes.h"
@@ -8,7 +9,10 @@
 #include <nlohmann/json.hpp>
 
 #include <array>
+#include <chrono>
 #include <filesystem>
+#include <fstream>
+#include <optional>
 #include <tuple>
 
 namespace dovrel {
@@ -101,6 +105,87 @@ TEST_F(ReadStockTest, LoadsTheDocumentIntoBoxesGridAndCurrentDocument) {
                          d.amounts[7].quantity),
               std::tuple(1234.5, 12.5, 21, 1.5));
     EXPECT_TRUE(d.amounts[2].isZero() && d.amounts[3].isZero());
+
+    // The control keeps the document it shows, each text as stored and as shown.
+    ASSERT_TRUE(card->document());
+    const Document& doc = *card->document();
+    EXPECT_EQ(
+        std::tuple(doc.type, doc.record, doc.file, doc.lines.size(), doc.lines[1].textOnly,
+                   doc.lines[2].lineNumber, doc.totals.beforeVat, doc.totals.withVat),
+        std::tuple(20, 10, Path(company->file("ISHP.FIX").string()), 3u, true, 7, 900.0, 1053.0));
+    EXPECT_EQ(U(doc.customer.stored + "|" + doc.customer.logical + "|" + doc.address1.logical),
+              "ןהכ השמ|משה כהן|5 הרצל");
+    EXPECT_EQ(U(doc.lines[0].description.logical + "|" + doc.lines[0].currencyName),
+              "מברג חשמלי|ש");
+    EXPECT_EQ(doc.totals.foreign, d.header.foreignTotal);
+}
+
+// The walk alone changes neither the boxes nor the grid and reports nothing;
+// it says what it found, or why there is nothing.
+TEST_F(ReadStockTest, TheWalkYieldsTheDocumentOrWhyThereIsNone) {
+    write({{"documents", {Doc(20, "1", "א", {Line("A", "a")})}}});
+    auto walk = [&](const std::string& direction, int16_t row = kDeliveryRow) {
+        StockContext context{state.DocTypes, state.DocFiles, state.Company, state.Doc, messages};
+        return WalkStock(*card, context, Path(company->path().string()), row, "",
+                         Variant(std::string()), direction, "");
+    };
+    card->txtReference1.setText("before");
+    StockRead found = walk("First");
+    ASSERT_EQ(found.outcome, StockRead::Outcome::Found);
+    EXPECT_EQ(std::tuple(found.stoppedAt, U(found.document->reference.logical),
+                         box(card->txtReference1), card->DocLines.Rows(), card->document()),
+              std::tuple(4, "1", "before", 2, std::nullopt));
+
+    StockRead none = walk("Next");
+    EXPECT_EQ(std::tuple(none.outcome, none.stoppedAt, none.document.has_value()),
+              std::tuple(StockRead::Outcome::NotFound, 5, false));
+    EXPECT_EQ(walk("First", 30).outcome, StockRead::Outcome::FileMissing); // a row without a file
+    StockRead failed = walk("Sideways");
+    EXPECT_EQ(std::tuple(failed.outcome, failed.error),
+              std::tuple(StockRead::Outcome::Failed, "Unknown direction \"Sideways\""));
+    EXPECT_EQ(messages.shown().size(), 0u);
+
+    // Through the control: a read that finds nothing leaves it no document.
+    read("First");
+    ASSERT_TRUE(card->document());
+    read("Next");
+    EXPECT_FALSE(card->document());
+}
+
+// The company's own currency names show from the first document on. Its
+// adf.fix is read once, and again when the file changes; when it is missing
+// or short the document still shows, with the names it had.
+TEST_F(ReadStockTest, TheCompanyRecordIsReadWhenShownAndAgainWhenItChanges) {
+    json currencyLine = {{"key", "A"}, {"price", 1}, {"quantity", 1}, {"currency", 10}};
+    auto described = [&](const std::string& currency) {
+        return json{{"company", {{"currencies", {currency}}}},
+                    {"documents", {Doc(20, "1", "א", {currencyLine})}}};
+    };
+    write(described("יורו"));
+    auto currency = [&] {
+        read("First");
+        return cell(1, 6) + lastMessage();
+    };
+    EXPECT_EQ(currency(), "יורו");
+
+    // Another adf.fix written over the first in place.
+    test::TempDir other;
+    sample::WriteCompany(described("דולר"), other.path());
+    std::filesystem::path adf = company->file("adf.fix");
+    auto stamp = std::filesystem::last_write_time(adf);
+    std::ofstream(adf, std::ios::binary | std::ios::in) << test::ReadAll(other.path() / "adf.fix");
+    // Unchanged as far as the file system tells, it is not read again...
+    std::filesystem::last_write_time(adf, stamp);
+    EXPECT_EQ(currency(), "יורו");
+    // ...and once its time moves it is.
+    std::filesystem::last_write_time(adf, stamp + std::chrono::seconds(2));
+    EXPECT_EQ(currency(), "דולר");
+
+    std::filesystem::resize_file(adf, 100);
+    EXPECT_EQ(currency(), "דולר");
+    std::filesystem::remove(adf);
+    EXPECT_EQ(currency(), "דולר");
+    EXPECT_EQ(box(card->txtReference1), "1");
 }
 
 TEST_F(ReadStockTest, WalksForwardAndBackwardThroughTheDocumentsOfTheType) {

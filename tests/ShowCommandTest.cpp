@@ -105,7 +105,7 @@ TEST(ShowCommandTest, PrintsTheFirstDocumentOfTheTypeFromTheStartRecordOrItsStat
     EXPECT_THAT(Show({path, 20, 4, false}).out, HasSubstr("דנה לוי"));
     // Nothing after record 9: the scan's progress shows, then the line is cleared.
     Output none = Show({path, 20, 9, false});
-    EXPECT_EQ(none.out, "לא נמצא מסמך\n");
+    EXPECT_EQ(std::tie(none.code, none.out), std::make_tuple(0, "לא נמצא מסמך\n"));
     EXPECT_THAT(none.progress, MatchesRegex("\r[0-9]+%.*\r     \r"));
     // A code without a document type shows the first type, and says so.
     Output unknown = Show({path, 8, 2, false});
