@@ -29,17 +29,30 @@ std::string LogicalField(const unsigned char* record, size_t offset, size_t widt
     return TrimCopy(LogicalText(text));
 }
 
-void AddAccount(AccountsTable& table, const unsigned char* record) {
-    std::string key = TrimCopy(LogicalText(Field(record, kAccountKeyOffset, kAccountKeyWidth)));
-    if (key.empty())
-        return;
+std::string KeyOf(const unsigned char* record) {
+    return TrimCopy(LogicalText(Field(record, kAccountKeyOffset, kAccountKeyWidth)));
+}
+
+AccountEntry EntryOf(const unsigned char* record, std::string key) {
     AccountEntry entry;
     entry.Key = std::move(key);
     entry.Phone = TrimCopy(Field(record, kPhoneOffset, kPhoneWidth));
     entry.Details = LogicalField(record, kDetailsOffset, kDetailsWidth);
     entry.District = LogicalField(record, kDistrictOffset, kDistrictWidth);
-    table.Accounts.push_back(std::move(entry));
+    return entry;
+}
+
+void AddAccount(AccountsTable& table, const unsigned char* record) {
+    std::string key = KeyOf(record);
+    if (key.empty())
+        return;
+    table.Accounts.push_back(EntryOf(record, std::move(key)));
     ++table.AccountCount;
+}
+
+AccountEntry NoAccount() {
+    std::string empty = FromUtf8("ריק");
+    return AccountEntry{"", empty, empty, empty};
 }
 
 } // namespace
@@ -68,8 +81,23 @@ AccountEntry FindAccount(const AccountsTable& table, const std::string& key) {
     for (size_t i = 1; i <= count; ++i)
         if (EqualsNoCase(table.Accounts[i].Key, key))
             return table.Accounts[i];
-    std::string empty = FromUtf8("ריק");
-    return AccountEntry{"", empty, empty, empty};
+    return NoAccount();
+}
+
+AccountEntry FindAccountInFile(const Path& CompPath, const std::string& key, ProgressBar progress) {
+    RecordFile file(ResolvePath(CompPath.plus("\\ACT.fix")), kActRecordLength);
+    int64_t last = LastScanRecord(file.length(), kActRecordLength);
+    ProgressReset resetter(progress);
+    for (int64_t n = 2; n <= last; ++n) {
+        const unsigned char* record = file.record(n);
+        if (record == nullptr)
+            break;
+        if (std::string found = KeyOf(record); !found.empty() && EqualsNoCase(found, key))
+            return EntryOf(record, std::move(found));
+        if (n % kProgressEvery == 0)
+            progress.show(n, last);
+    }
+    return NoAccount();
 }
 
 } // namespace dovrel

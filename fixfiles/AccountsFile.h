@@ -37,4 +37,9 @@ bool ReadACT(const Path& CompPath, AccountsTable& table, ProgressBar progress);
 // case; when there is none, an empty key and "ריק" in the other three fields.
 AccountEntry FindAccount(const AccountsTable& table, const std::string& key);
 
+// What ReadACT and then FindAccount give, read straight from the file: the
+// scan stops at the first match and holds one record at a time, so its memory
+// does not grow with the file. The table is not touched.
+AccountEntry FindAccountInFile(const Path& CompPath, const std::string& key, ProgressBar progress);
+
 } // namespace dovrel

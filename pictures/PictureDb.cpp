@@ -5,6 +5,7 @@
 #include "platform/Error.h"
 #include "platform/FileSystem.h"
 #include "platform/Messages.h"
+#include "platform/SafeFile.h"
 #include "platform/Sqlite.h"
 
 #include <sqlite3.h>
@@ -201,6 +202,7 @@ std::unique_ptr<Connection> OpenPictures(const std::string& path, bool write,
     struct stat info {};
     if (stat(fsPath.c_str(), &info) != 0)
         ThrowSystemError(doing, fsPath, errno);
+    CheckReadSource(fsPath, PictureDb::kMaxFileSize, "the picture database");
     int flags = write ? SQLITE_OPEN_READWRITE : SQLITE_OPEN_READONLY;
     if (std::string reason = ForeignReason(Head(fsPath, 100)); !reason.empty())
         throw Error(failure + ": not a picture database: " + reason);
@@ -251,11 +253,13 @@ void PictureDb::replaceAll(const std::vector<PictureRange>& ranges) const {
             throw Error(std::string(doing) + " " + ResolvePath(PathFromCp1255(path_)).shown() +
                         ": row " + std::to_string(i + 1) + ": " + problem +
                         "; nothing was changed");
-    if (ranges.size() > static_cast<size_t>(INT32_MAX))
-        throw Error(std::string(doing) + " " + ResolvePath(PathFromCp1255(path_)).shown() +
-                    ": too many ranges");
+    if (ranges.size() > kMaxRanges)
+        throw Error(std::string(doing) + " " + ResolvePath(PathFromCp1255(path_)).shown() + ": " +
+                    std::to_string(ranges.size()) + " ranges are more than the " +
+                    std::to_string(kMaxRanges) +
+                    " the picture settings can list; nothing was changed");
     auto db = OpenPictures(path_, true, busyTimeout_, doing);
-    db->exec("BEGIN IMMEDIATE");
+    db->begin("BEGIN IMMEDIATE");
     Statement upsert(*db, kUpsert);
     for (size_t i = 0; i < ranges.size(); ++i) {
         int32_t rangeId = static_cast<int32_t>(i + 1);
@@ -275,11 +279,16 @@ int32_t PictureDb::add(PictureRange range) const {
         throw Error(std::string(doing) + " " + ResolvePath(PathFromCp1255(path_)).shown() + ": " +
                     problem);
     auto db = OpenPictures(path_, true, busyTimeout_, doing);
-    db->exec("BEGIN IMMEDIATE");
+    db->begin("BEGIN IMMEDIATE");
     Statement last(*db, "SELECT coalesce(max(RangeID), 0) FROM tItemPicture");
     last.step();
     int64_t highest = last.integer(0);
     last.reset();
+    Statement count(*db, "SELECT count(*) FROM tItemPicture");
+    count.step();
+    if (count.integer(0) >= static_cast<int64_t>(kMaxRanges))
+        throw Error(std::string(doing) + " " + ResolvePath(path_) + ": it holds " +
+                    std::to_string(kMaxRanges) + " ranges, the most the picture settings can list");
     if (highest >= INT32_MAX)
         throw Error(std::string(doing) + " " + ResolvePath(PathFromCp1255(path_)).shown() +
                     ": no range number is free");
@@ -306,7 +315,7 @@ void WriteEmptyDatabase(const std::string& fsPath, std::chrono::milliseconds tim
                         const std::string& failure) {
     Connection db(fsPath, SQLITE_OPEN_READWRITE, timeout, failure);
     db.exec("PRAGMA journal_mode = DELETE");
-    db.exec("BEGIN IMMEDIATE");
+    db.begin("BEGIN EXCLUSIVE");
     db.exec(kCreateTable);
     db.exec(kCreateIndex);
     db.exec("COMMIT");
@@ -322,17 +331,17 @@ void WriteEmptyDatabase(const std::string& fsPath, std::chrono::milliseconds tim
 }
 
 // A new file beside the database, named after it; removed again unless kept.
-// It gets the old file's permissions, or those any new file would get.
+// It gets the permissions of the regular file it replaces, else mode 0600.
 class NewFile {
 public:
     NewFile(const std::string& fsPath, const std::string& failure) {
         struct stat old {};
-        bool hadOld = stat(fsPath.c_str(), &old) == 0;
+        bool hadOld = lstat(fsPath.c_str(), &old) == 0 && S_ISREG(old.st_mode);
         std::random_device random;
         int fd = -1;
         for (int attempt = 0; fd < 0 && attempt < 100; ++attempt) {
             path_ = fsPath + ".new-" + std::to_string(random());
-            fd = open(path_.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0666);
+            fd = open(path_.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0600);
             if (fd < 0 && errno != EEXIST)
                 break;
         }
@@ -365,6 +374,7 @@ private:
 void PictureDb::create(bool replaceForeign) const {
     std::string fsPath = ResolvePath(PathFromCp1255(path_)).native();
     std::string failure = "Cannot create the picture database " + fsPath;
+    CheckWriteTarget(fsPath, "the picture database");
     Inspection old = inspect();
     if (old.kind == FileKind::Foreign && !replaceForeign)
         throw Error(failure + ": the file there is not a picture database (" + old.reason +
@@ -376,7 +386,7 @@ void PictureDb::create(bool replaceForeign) const {
     std::unique_ptr<Connection> lock;
     if (old.kind == FileKind::Pictures) {
         lock = std::make_unique<Connection>(fsPath, SQLITE_OPEN_READWRITE, busyTimeout_, failure);
-        lock->exec("BEGIN EXCLUSIVE");
+        lock->begin("BEGIN EXCLUSIVE");
         lock->exec("SELECT count(*) FROM sqlite_master");
     }
     for (const char* suffix : {"-journal", "-wal", "-shm"})

@@ -35,6 +35,10 @@ public:
     static constexpr const char* kFileName = "Dovrel.def";
     // Field sizes in characters: item keys, category codes, picture file.
     static constexpr size_t kKeySize = 12, kCodeSize = 3, kPicFileSize = 50;
+    // The most ranges the picture settings form can list; more are refused.
+    static constexpr size_t kMaxRanges = 32767;
+    // A database of that many ranges of the longest texts is far below this.
+    static constexpr size_t kMaxFileSize = 64 * 1024 * 1024;
 
     enum class FileKind { Missing, Pictures, Foreign };
     struct Inspection {

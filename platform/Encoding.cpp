@@ -95,7 +95,9 @@ std::string ToTerminal(std::string_view cp1255) {
     out.reserve(cp1255.size() * 2);
     for (char ch : cp1255) {
         UChar32 c = table.toUnicode[static_cast<unsigned char>(ch)];
-        AppendUtf8(out, IsControl(c) ? 0xFFFD : c);
+        // Every control, TAB and the line ends too: a text must not split or
+        // forge a line of the commands' line-oriented output.
+        AppendUtf8(out, c < 0x20 || IsControl(c) ? 0xFFFD : c);
     }
     return out;
 }

@@ -19,9 +19,10 @@ std::string ToUtf8(std::string_view cp1255);
 // malformed UTF-8 sequence, becomes "?".
 std::string FromUtf8(std::string_view utf8);
 
-// Code page 1255 bytes to UTF-8 for a terminal: as ToUtf8, but control
-// characters other than TAB, LF and CR become U+FFFD, so stored bytes
-// cannot move the cursor or change the terminal's state.
+// Code page 1255 bytes to UTF-8 for a terminal or line-oriented output: as
+// ToUtf8, but every control character (C0 with TAB, LF and CR, DEL, C1)
+// becomes U+FFFD, so stored bytes can neither move the cursor, change the
+// terminal's state nor start a line. TerminalText does the same for UTF-8.
 std::string ToTerminal(std::string_view cp1255);
 
 // Bytes that should be UTF-8 (a file name, say) as valid UTF-8: each

@@ -6,12 +6,13 @@
 #include <sqlite3.h>
 
 #include <cstring>
+#include <thread>
 
 namespace dovrel {
 
 SqliteConnection::SqliteConnection(const std::string& fsPath, int flags,
                                    std::chrono::milliseconds busyTimeout, std::string failure)
-    : failure_(std::move(failure)) {
+    : failure_(std::move(failure)), busyTimeout_(busyTimeout) {
     if (sqlite3_open_v2(fsPath.c_str(), &db_, flags, nullptr) != SQLITE_OK) {
         std::string reason = describe();
         sqlite3_close_v2(db_); // a failed open still holds a handle
@@ -32,6 +33,15 @@ void SqliteConnection::fail(const std::string& where) const {
 void SqliteConnection::exec(const char* sql) {
     if (sqlite3_exec(db_, sql, nullptr, nullptr, nullptr) != SQLITE_OK)
         fail();
+}
+
+void SqliteConnection::begin(const char* sql) {
+    auto deadline = std::chrono::steady_clock::now() + busyTimeout_;
+    while (sqlite3_exec(db_, sql, nullptr, nullptr, nullptr) != SQLITE_OK) {
+        if (code() != SQLITE_BUSY || std::chrono::steady_clock::now() >= deadline)
+            fail();
+        std::this_thread::sleep_for(std::chrono::milliseconds(5));
+    }
 }
 
 void SqliteConnection::close() {

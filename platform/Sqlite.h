@@ -25,6 +25,10 @@ public:
 
     [[noreturn]] void fail(const std::string& where = {}) const;
     void exec(const char* sql);
+    // BEGIN IMMEDIATE or BEGIN EXCLUSIVE, tried again while another process
+    // holds the file, until the busy timeout has passed: SQLite's own waiting
+    // gives up at once in some races (two processes making the same new file).
+    void begin(const char* sql);
     // Closes now, so that a failure to finish writing is reported.
     void close();
     // The primary result code of the last call.
@@ -37,6 +41,7 @@ private:
 
     sqlite3* db_ = nullptr;
     std::string failure_;
+    std::chrono::milliseconds busyTimeout_;
 };
 
 // A prepared statement. Texts cross as code page 1255 here and UTF-8 in the

@@ -52,16 +52,29 @@ std::string Quoted(const std::string& cp1255) {
     return quoted;
 }
 
-// Whether there is anything at the path; a missing file (or directory above it) is an
-// empty store, any other failure to look is an error.
+// A settings file of this size holds far more than any user saves.
+constexpr off_t kMaxStoreSize = 16 * 1024 * 1024;
+
+// Whether the store's file is there; a missing file (or directory above it) is an
+// empty store. Anything but a regular file of a sane size is refused: a link
+// is not followed, a pipe or a device is not opened.
 bool Exists(const std::string& path, const std::string& failure) {
     struct stat info {};
-    if (stat(path.c_str(), &info) == 0)
-        return true;
-    if (errno == ENOENT || errno == ENOTDIR)
-        return false;
-    throw Error(failure + ": " + std::strerror(errno));
+    if (lstat(path.c_str(), &info) != 0) {
+        if (errno == ENOENT || errno == ENOTDIR)
+            return false;
+        throw Error(failure + ": " + std::strerror(errno));
+    }
+    if (S_ISLNK(info.st_mode))
+        throw Error(failure + ": it is a link, which Dovrel does not follow for its settings");
+    if (!S_ISREG(info.st_mode))
+        throw Error(failure + ": it is not a regular file");
+    if (info.st_size > kMaxStoreSize)
+        throw Error(failure + ": it is larger than 16 MiB, too large for a settings store");
+    return true;
 }
+
+constexpr int kRead = SQLITE_OPEN_READWRITE | SQLITE_OPEN_NOFOLLOW;
 
 std::string HomeDirectory() {
     const char* home = std::getenv("HOME");
@@ -99,7 +112,7 @@ std::optional<std::string> SqliteSettingsStore::FindSetting(const std::string& a
     std::string failure = "Cannot read setting " + Quoted(key) + " from " + path_;
     if (!Exists(path_, failure))
         return std::nullopt;
-    SqliteConnection db(path_, SQLITE_OPEN_READWRITE, busyTimeout_, failure);
+    SqliteConnection db(path_, kRead, busyTimeout_, failure);
     if (!HasTable(db))
         return std::nullopt;
     SqliteStatement query(
@@ -115,8 +128,9 @@ void SqliteSettingsStore::SaveSetting(const std::string& app, const std::string&
     std::string failure = "Cannot save setting " + Quoted(key) + " to " + path_;
     MakeDirectory(failure);
     MakeFile(failure);
-    SqliteConnection db(path_, SQLITE_OPEN_READWRITE, busyTimeout_, failure);
-    db.exec("BEGIN IMMEDIATE");
+    Exists(path_, failure);
+    SqliteConnection db(path_, kRead, busyTimeout_, failure);
+    db.begin("BEGIN EXCLUSIVE");
     db.exec(kCreateTable);
     SqliteStatement upsert(db,
                            "INSERT INTO settings (app, section, key, value) VALUES (?1, ?2, ?3, ?4)"
@@ -131,8 +145,8 @@ bool SqliteSettingsStore::DeleteSetting(const std::string& app, const std::strin
     std::string failure = "Cannot remove setting " + Quoted(key) + " from " + path_;
     if (!Exists(path_, failure))
         return false;
-    SqliteConnection db(path_, SQLITE_OPEN_READWRITE, busyTimeout_, failure);
-    db.exec("BEGIN IMMEDIATE");
+    SqliteConnection db(path_, kRead, busyTimeout_, failure);
+    db.begin("BEGIN EXCLUSIVE");
     if (!HasTable(db))
         return false;
     SqliteStatement erase(db, "DELETE FROM settings WHERE app = ?1 AND section = ?2 AND key = ?3");
@@ -149,7 +163,7 @@ std::vector<SettingsStore::Entry> SqliteSettingsStore::ListSettings(const std::s
     std::vector<Entry> entries;
     if (!Exists(path_, failure))
         return entries;
-    SqliteConnection db(path_, SQLITE_OPEN_READWRITE, busyTimeout_, failure);
+    SqliteConnection db(path_, kRead, busyTimeout_, failure);
     if (!HasTable(db))
         return entries;
     SqliteStatement query(db, "SELECT key, value FROM settings WHERE app = ?1 AND section = ?2");

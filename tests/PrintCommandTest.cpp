@@ -89,7 +89,7 @@ TEST_F(PrintCommandTest, BadRequestsAreToldPlainly) {
     expectFailure({"print", dir, "--type", "21", "--lang", "3"}, "--lang");
     expectFailure({"print", dir, "--type", "21", "--no-open", "--out",
                    (temp.path() / "missing" / "p.htm").string()},
-                  "Could not write the page");
+                  "Cannot write the page");
 
     EXPECT_EQ(PrintCommand::PageName(" a/b c "), "a_b_c");
     EXPECT_EQ(PrintCommand::PageName("\xE0\xE1"), "__");

@@ -117,7 +117,7 @@ TEST(ShowCommandTest, PrintsTheFirstDocumentOfTheTypeFromTheStartRecordOrItsStat
     ModuleState shared;
     HostSession session(shared);
     session.handle(json({"ReadAdf", path}).dump());
-    json host = json::parse(*session.handle(json({"call", "ShowDoc", path, 20, 2}).dump()));
+    json host = json::parse(session.handle(json({"call", "ShowDoc", path, 20, 2}).dump()));
     EXPECT_EQ(json({state["CompDir"], state["controls"]["txtCustomerName"]}),
               json({path, "משה כהן"}));
     EXPECT_EQ(state, host["state"]);

@@ -1,10 +1,13 @@
 #include "app/cli/AccountCommand.h"
 
+#include "app/cli/CompanyDir.h"
+#include "app/cli/ExitCode.h"
 #include "app/cli/StateJson.h"
 #include "fixfiles/AccountsFile.h"
 #include "fixfiles/TextDecoding.h"
 #include "platform/Encoding.h"
 #include "platform/Error.h"
+#include "platform/TerminalText.h"
 
 #include <ostream>
 
@@ -19,9 +22,9 @@ int AccountCommand::run(std::ostream& out) {
     // The scan's progress bar, which nobody sees here.
     Shape frame("ProgressFrame", 0, 0, 1000, 100);
     Shape fill("ProgressFill", 0, 0, 0, 100);
-    AccountsTable table;
-    ReadACT(Path(options_.compDir), table, {frame, fill});
-    AccountEntry account = FindAccount(table, key);
+    Path compDir(options_.compDir);
+    CheckCompanyDir(compDir);
+    AccountEntry account = FindAccountInFile(compDir, key, {frame, fill});
     if (options_.json) {
         nlohmann::json answer = {{"key", ToUtf8(key)},
                                  {"found", !account.Key.empty()},
@@ -29,12 +32,12 @@ int AccountCommand::run(std::ostream& out) {
                                  {"details", ToUtf8(account.Details)},
                                  {"district", ToUtf8(account.District)}};
         out << StateJson::Dump(answer, 2) << '\n';
-        return 0;
+    } else {
+        out << "טלפונים: " << ToTerminal(account.Phone) << '\n'
+            << "פרטים: " << ToTerminal(account.Details) << '\n'
+            << "שכונה: " << ToTerminal(account.District) << '\n';
     }
-    out << "טלפונים: " << ToTerminal(account.Phone) << '\n'
-        << "פרטים: " << ToTerminal(account.Details) << '\n'
-        << "שכונה: " << ToTerminal(account.District) << '\n';
-    return 0;
+    return account.Key.empty() ? kExitNotFound : kExitDone;
 }
 
 } // namespace dovrel

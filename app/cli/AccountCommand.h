@@ -19,8 +19,8 @@ class AccountCommand {
 public:
     explicit AccountCommand(AccountOptions options) : options_(std::move(options)) {}
 
-    // Exit code 0, found or not; a missing or unreadable accounts file is an
-    // Error.
+    // Exit code 0 when found, 3 when not; a missing or unreadable accounts
+    // file is an Error.
     int run(std::ostream& out);
 
 private:

@@ -1,9 +1,11 @@
 #include "app/cli/CompaniesCommand.h"
 
+#include "app/cli/ExitCode.h"
 #include "app/cli/StateJson.h"
 #include "forms/Companies.h"
 #include "platform/Encoding.h"
 #include "platform/Error.h"
+#include "platform/TerminalText.h"
 
 #include <ostream>
 
@@ -32,9 +34,10 @@ int CompaniesCommand::run(std::ostream& out, std::ostream& err) {
     }
     if (options_.json)
         out << StateJson::Dump(list, 2) << '\n';
-    else if (listed == 0)
-        err << "No companies found in " << options_.mainDir << '\n';
-    return 0;
+    if (listed > 0)
+        return kExitDone;
+    err << "No companies found in " << TerminalText(options_.mainDir) << '\n';
+    return kExitNotFound;
 }
 
 } // namespace dovrel

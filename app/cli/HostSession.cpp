@@ -23,10 +23,6 @@ namespace {
 constexpr int64_t kInt16Min = std::numeric_limits<int16_t>::min();
 constexpr int64_t kInt16Max = std::numeric_limits<int16_t>::max();
 
-bool IsBlank(std::string_view line) {
-    return line.find_first_not_of(" \t\r\n") == std::string_view::npos;
-}
-
 json Failure(const std::string& description) {
     return {{"ok", false}, {"error", description}};
 }
@@ -75,11 +71,12 @@ void HostSession::addCommand(const std::string& name, Command command) {
     commands_[name] = std::move(command);
 }
 
-std::optional<std::string> HostSession::handle(std::string_view line) {
-    if (IsBlank(line))
-        return std::nullopt;
+std::string HostSession::handle(std::string_view line) {
     json reply;
     try {
+        // The JSON reader would take a NUL byte as the end of the text.
+        if (line.find('\0') != std::string_view::npos)
+            throw Error("Bad JSON: a request must not hold a NUL byte");
         json request = json::parse(line);
         reply = answer(request);
     } catch (const json::parse_error& e) {
@@ -125,10 +122,7 @@ json HostSession::answer(const json& request) {
 int HostSession::serve(std::istream& in, std::ostream& out) {
     std::string line;
     while (std::getline(in, line)) {
-        std::optional<std::string> reply = handle(line);
-        if (!reply)
-            continue;
-        out << *reply << '\n';
+        out << handle(line) << '\n';
         out.flush();
         if (!out)
             return 1;

@@ -41,8 +41,9 @@ public:
     HostSession(std::unique_ptr<SettingsStore> settings, ModuleState& shared);
     ~HostSession();
 
-    // The answer to one input line; nothing for a blank line.
-    std::optional<std::string> handle(std::string_view line);
+    // The answer to one input line, blank or not: one line of JSON. A line that
+    // is not one whole JSON value gets an error answer.
+    std::string handle(std::string_view line);
     // Answers every line of in on out, flushing after each, until the end of
     // the input. Returns the exit code.
     int serve(std::istream& in, std::ostream& out);

@@ -6,6 +6,19 @@
 
 namespace dovrel {
 
+namespace {
+
+// The usage line shows a positional with several forms as its own text.
+class FormsInUsage : public CLI::Formatter {
+public:
+    std::string make_option_usage(const CLI::Option* opt) const override {
+        return opt->get_option_text().empty() ? Formatter::make_option_usage(opt)
+                                              : opt->get_option_text();
+    }
+};
+
+} // namespace
+
 void AddPictures(CLI::App& app, Runner& run) {
     auto options = std::make_shared<PicturesOptions>();
     CLI::App* pictures =
@@ -17,26 +30,37 @@ void AddPictures(CLI::App& app, Runner& run) {
     pictures->require_subcommand(1);
     pictures->fallthrough();
     pictures->add_subcommand("init", "Make an empty picture database")
-        ->add_flag("--force", options->force, "Replace a file that is not a picture database");
+        ->add_flag("--force", options->force,
+                   "Replace a database that holds ranges, or a file that is not one");
     pictures->add_subcommand("list", "Print the ranges by RangeID")
         ->add_flag("--json", options->json, "Print them as JSON");
-    pictures->add_subcommand("add", "Add a range: FROMKEY TOKEY [FROMCAT TOCAT] PICFILE")
-        ->add_option("ARGS", options->args)
+    CLI::App* add = pictures->add_subcommand("add", "Add a range of item keys and category codes");
+    add->formatter(std::make_shared<FormsInUsage>());
+    add->add_option("ARGS", options->args, "Without FROMCAT TOCAT the range takes every code")
+        ->option_text("FROMKEY TOKEY [FROMCAT TOCAT] PICFILE")
         ->expected(3, 5)
         ->required();
     pictures->add_subcommand("delete", "Delete a range by its RangeID")
-        ->add_option("RANGEID", options->args)
+        ->add_option("RANGEID", options->args, "The range's number")
+        ->expected(1)
         ->required();
-    pictures->add_subcommand("which", "The picture a line with ITEMKEY and CATCODE gets")
-        ->add_option("ARGS", options->args)
+    CLI::App* which =
+        pictures->add_subcommand("which", "The picture a line with ITEMKEY and CATCODE gets");
+    which->formatter(std::make_shared<FormsInUsage>());
+    which->add_option("ARGS", options->args, "An item key and a category code")
+        ->option_text("ITEMKEY CATCODE")
         ->expected(2)
         ->required();
     pictures->add_subcommand("export", "Write the ranges to a CSV file")
-        ->add_option("FILE", options->args)
+        ->add_option("FILE", options->args, "The CSV file")
+        ->expected(1)
         ->required();
-    pictures->add_subcommand("import", "Replace every range with those of a CSV file")
-        ->add_option("FILE", options->args)
+    CLI::App* import =
+        pictures->add_subcommand("import", "Replace every range with those of a CSV file");
+    import->add_option("FILE", options->args, "The CSV file, with or without its heading")
+        ->expected(1)
         ->required();
+    import->add_flag("--force", options->force, "Import a file without ranges: delete them all");
     pictures->callback([options, pictures, &run] {
         options->action = pictures->get_subcommands().front()->get_name();
         run = [options] {

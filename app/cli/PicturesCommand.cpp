@@ -1,14 +1,18 @@
 #include "app/cli/PicturesCommand.h"
 
+#include "app/cli/ExitCode.h"
+#include "app/cli/StateJson.h"
 #include "pictures/PictureLookup.h"
 #include "platform/Encoding.h"
 #include "platform/Error.h"
 #include "platform/FileSystem.h"
+#include "platform/SafeFile.h"
+#include "platform/TerminalText.h"
 
 #include <nlohmann/json.hpp>
 
+#include <algorithm>
 #include <charconv>
-#include <fstream>
 #include <ostream>
 #include <sstream>
 #include <utility>
@@ -16,6 +20,10 @@
 namespace dovrel {
 
 namespace {
+
+// A CSV file of the most ranges the settings can list, every field quoted and
+// of the longest UTF-8, is below this.
+constexpr size_t kMaxCsvBytes = 32 * 1024 * 1024;
 
 constexpr const char* kFields[] = {"FromItemKey", "ToItemKey", "FromCatCode", "ToCatCode",
                                    "PicFile"};
@@ -37,6 +45,45 @@ PictureRange RangeOfCells(const std::vector<std::string>& utf8) {
     range.FromItemKey = NullWhenEmpty(*range.FromItemKey);
     range.FromCatCode = NullWhenEmpty(*range.FromCatCode);
     return range;
+}
+
+// A range from the five cells of a CSV record: an empty cell is no value
+// (Null), as an export writes it.
+PictureRange RangeOfRecord(const std::vector<std::string>& utf8) {
+    PictureRange range;
+    for (size_t i = 0; i < 5; ++i)
+        range.*kMembers[i] = NullWhenEmpty(FromUtf8(utf8[i]));
+    return range;
+}
+
+// Where each of the five fields is in the records: by the heading's names
+// when the first record is a heading (which is then removed), else in the
+// export's order.
+std::vector<size_t> TakeColumns(std::vector<std::vector<std::string>>& records,
+                                const std::string& file) {
+    std::vector<size_t> columns = {0, 1, 2, 3, 4};
+    if (records.empty())
+        return columns;
+    const std::vector<std::string>& heading = records.front();
+    auto named = [&](size_t field) {
+        return std::find(heading.begin(), heading.end(), kFields[field]) - heading.begin();
+    };
+    bool isHeading = false;
+    for (size_t field = 0; field < 5; ++field)
+        isHeading = isHeading || static_cast<size_t>(named(field)) < heading.size();
+    if (!isHeading)
+        return columns;
+    for (size_t field = 0; field < 5; ++field) {
+        columns[field] = static_cast<size_t>(named(field));
+        if (columns[field] >= heading.size())
+            throw Error(file + ": the heading has no column " + kFields[field] +
+                        "; nothing was changed");
+    }
+    if (heading.size() != 5)
+        throw Error(file + ": the heading has " + std::to_string(heading.size()) +
+                    " columns, not the five picture fields; nothing was changed");
+    records.erase(records.begin());
+    return columns;
 }
 
 std::string CsvField(const std::string& utf8) {
@@ -95,25 +142,21 @@ PicturesCommand::PicturesCommand(PicturesOptions options, SettingsStore& store)
     : options_(std::move(options)), store_(store) {}
 
 std::string PicturesCommand::dbName(std::ostream& err) {
-    if (!options_.db.empty()) {
-        std::string dir = FromUtf8(options_.db);
-        if (dir.back() != '/' && dir.back() != '\\')
-            dir += '/';
-        return dir + PictureDb::kFileName;
-    }
+    if (!options_.db.empty())
+        return JoinFolder(FromUtf8(options_.db), PictureDb::kFileName);
     std::string dir = store_.GetSetting(FromUtf8(options_.app), "Params", "DBPath", "c:\\");
     if (dir.empty() || SettingsStore::FoldCase(dir) == "c:\\") {
         err << "No picture folder is set: give one with --db DIR, or save DBPath in the picture "
                "settings (dovrel settings set DBPath DIR/)\n";
         return "";
     }
-    return dir + PictureDb::kFileName;
+    return JoinFolder(dir, PictureDb::kFileName);
 }
 
 int PicturesCommand::run(std::ostream& out, std::ostream& err) {
     std::string name = dbName(err);
     if (name.empty())
-        return 1;
+        return kExitFailed;
     PictureDb db(name);
     const std::string& action = options_.action;
     if (action == "init")
@@ -140,7 +183,7 @@ int PicturesCommand::run(std::ostream& out, std::ostream& err) {
 
 void PicturesCommand::needArgs(size_t count, const char* usage) const {
     if (options_.args.size() != count)
-        throw Error(std::string("Usage: dovrel pictures ") + usage);
+        throw CommandError(kExitUsage, std::string("Usage: dovrel pictures ") + usage);
 }
 
 int PicturesCommand::init(const PictureDb& db, std::ostream& out) {
@@ -149,6 +192,12 @@ int PicturesCommand::init(const PictureDb& db, std::ostream& out) {
         throw Error("The file " + ResolvePath(PathFromCp1255(db.path())).shown() +
                     " is not a picture database (" + old.reason +
                     "); it was left as it is. Give --force to replace it");
+    if (old.kind == PictureDb::FileKind::Pictures && !options_.force) {
+        if (size_t held = db.rangesById().size(); held > 0)
+            throw Error("The picture database " + ResolvePath(PathFromCp1255(db.path())).shown() +
+                        " holds " + std::to_string(held) +
+                        " ranges; it was left as it is. Give --force to empty it");
+    }
     db.create(options_.force);
     out << "Created an empty picture database at " << ResolvePath(PathFromCp1255(db.path())).shown()
         << '\n';
@@ -163,7 +212,7 @@ int PicturesCommand::list(const PictureDb& db, std::ostream& out) const {
             nlohmann::json row = {{"RangeID", range.RangeID}};
             for (size_t i = 0; i < 5; ++i) {
                 const std::optional<std::string>& value = range.*kMembers[i];
-                row[kFields[i]] = value ? nlohmann::json(ToUtf8(*value)) : nlohmann::json();
+                row[kFields[i]] = value ? StateJson::Text(*value) : nlohmann::json();
             }
             all.push_back(row);
         }
@@ -183,11 +232,13 @@ int PicturesCommand::list(const PictureDb& db, std::ostream& out) const {
 int PicturesCommand::add(const PictureDb& db, std::ostream& out) const {
     const std::vector<std::string>& a = options_.args;
     if (a.size() != 3 && a.size() != 5)
-        throw Error("Usage: dovrel pictures add FROMKEY TOKEY [FROMCAT TOCAT] PICFILE");
+        throw CommandError(kExitUsage,
+                           "Usage: dovrel pictures add FROMKEY TOKEY [FROMCAT TOCAT] PICFILE");
     PictureRange range = a.size() == 5 ? RangeOfCells(a) : RangeOfCells({a[0], a[1], "", "", a[2]});
     if (a.size() == 3)
         range.ToCatCode.reset(); // no category bounds at all
-    out << "Added range " << db.add(range) << '\n';
+    int32_t added = db.add(range);
+    out << "Added range " << added << '\n';
     return 0;
 }
 
@@ -198,7 +249,7 @@ int PicturesCommand::remove(const PictureDb& db, std::ostream& err) const {
         return 0;
     err << "No range " << rangeId << " in " << ResolvePath(PathFromCp1255(db.path())).shown()
         << '\n';
-    return 1;
+    return kExitNotFound;
 }
 
 // A line's category code is three characters, as stored.
@@ -210,11 +261,11 @@ int PicturesCommand::which(const PictureDb& db, std::ostream& out, std::ostream&
     PictureLookup lookup(db.rangesInLookupOrder());
     if (const std::string* picture = lookup.pictureFor(key, code)) {
         out << ToTerminal(*picture) << '\n';
-        return 0;
+        return kExitDone;
     }
-    err << "No picture for item " << options_.args[0] << " with category code \""
-        << options_.args[1] << "\"\n";
-    return 1;
+    err << "No picture for item " << TerminalText(options_.args[0]) << " with category code \""
+        << TerminalText(options_.args[1]) << "\"\n";
+    return kExitNotFound;
 }
 
 int PicturesCommand::exportTo(const PictureDb& db, std::ostream& out) const {
@@ -226,32 +277,39 @@ int PicturesCommand::exportTo(const PictureDb& db, std::ostream& out) const {
             csv << (i ? "," : "") << CsvField(ToUtf8((range.*kMembers[i]).value_or("")));
         csv << "\r\n";
     }
-    std::ofstream file(options_.args[0], std::ios::binary | std::ios::trunc);
-    if (!(file << csv.str()) || !file.flush())
-        throw Error("Cannot write " + options_.args[0]);
+    WriteFileAtomically(options_.args[0], csv.str(), "the picture ranges");
     out << "Wrote the picture ranges to " << options_.args[0] << '\n';
     return 0;
 }
 
 int PicturesCommand::importFrom(const PictureDb& db, std::ostream& out) const {
     needArgs(1, "import FILE.csv");
-    std::ifstream file(options_.args[0], std::ios::binary);
-    if (!file)
-        throw Error("Cannot read " + options_.args[0]);
-    std::vector<std::vector<std::string>> records =
-        ParseCsv({std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>()});
-    if (!records.empty() && records.front().size() == 5 && records.front()[0] == kFields[0])
-        records.erase(records.begin()); // the heading
+    const std::string& file = options_.args[0];
+    std::string text = ReadWholeFile(file, kMaxCsvBytes, "the picture ranges");
+    if (text.starts_with("\xEF\xBB\xBF"))
+        text.erase(0, 3); // a byte-order mark
+    std::vector<std::vector<std::string>> records = ParseCsv(text);
+    std::vector<size_t> columns = TakeColumns(records, file);
+    if (records.size() > PictureDb::kMaxRanges)
+        throw Error(file + " holds " + std::to_string(records.size()) + " ranges, more than the " +
+                    std::to_string(PictureDb::kMaxRanges) +
+                    " the picture settings can list; nothing was changed");
+    if (records.empty() && !options_.force)
+        throw Error(file + " holds no picture ranges; importing it would delete every range of " +
+                    ResolvePath(db.path()) + ". Give --force to do that");
     std::vector<PictureRange> ranges;
     for (size_t i = 0; i < records.size(); ++i) {
         if (records[i].size() != 5)
-            throw Error(options_.args[0] + ": record " + std::to_string(i + 1) + " has " +
+            throw Error(file + ": record " + std::to_string(i + 1) + " has " +
                         std::to_string(records[i].size()) + " fields, not 5; nothing was changed");
-        ranges.push_back(RangeOfCells(records[i]));
+        std::vector<std::string> cells;
+        for (size_t column : columns)
+            cells.push_back(records[i][column]);
+        ranges.push_back(RangeOfRecord(cells));
     }
     db.replaceAll(ranges);
     out << "Imported " << ranges.size() << " picture ranges\n";
-    return 0;
+    return kExitDone;
 }
 
 } // namespace dovrel

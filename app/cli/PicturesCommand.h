@@ -15,7 +15,8 @@ struct PicturesOptions {
     std::string action;            // init, list, add, delete, which, export or import
     std::vector<std::string> args; // the action's own arguments, UTF-8
     bool json = false;             // list as JSON
-    bool force = false;            // init: replace a file that is not a picture database
+    bool force = false; // init: replace a database with ranges or a file that is not one;
+                        // import: a file without ranges empties the database
 };
 
 // `dovrel pictures`: the picture ranges of "Dovrel.def" without the desktop.
@@ -28,7 +29,7 @@ class PicturesCommand {
 public:
     PicturesCommand(PicturesOptions options, SettingsStore& store);
 
-    // Exit code: 0 done, 1 when there is nothing to show or the work failed.
+    // Exit code: 0 done, 1 failed, 2 wrong arguments, 3 no such range or picture.
     int run(std::ostream& out, std::ostream& err);
 
 private:

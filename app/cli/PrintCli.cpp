@@ -13,8 +13,7 @@ void AddPrint(CLI::App& app, Runner& run) {
     CLI::App* print = app.add_subcommand(
         "print", "Write the page of a document (or of several) and open it in the browser");
     print->add_option("COMPDIR", options->compDir, "Company directory")->required();
-    print->add_option("--type", options->type, "Document type code (default 20)")
-        ->check(CLI::Range(0, static_cast<int>(std::numeric_limits<int16_t>::max())));
+    AddTypeOption(*print, options->type);
     print->add_option("--start", options->start, "First record to look at (default 2)")
         ->check(CLI::Range(1, std::numeric_limits<int32_t>::max()));
     print
@@ -27,8 +26,9 @@ void AddPrint(CLI::App& app, Runner& run) {
         ->check(CLI::Range(0, 2));
     print->add_option("--out", options->out,
                       "The page file (one document) or an existing folder (several)");
-    print->add_flag("--no-open{false}", options->open, "Do not open the page in the browser");
-    print->add_option("--today", *today, "Today's date on the page, YYYY-MM-DD");
+    print->add_flag_callback(
+        "--no-open", [options] { options->open = false; }, "Do not open the page in the browser");
+    AddTodayOption(*print, *today, "Today's date on the page");
     print->callback([options, today, &run] {
         run = [options, today] {
             if (!today->empty())

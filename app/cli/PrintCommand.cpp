@@ -2,6 +2,8 @@
 
 #include "platform/Ascii.h"
 
+#include "app/cli/CompanyDir.h"
+#include "app/cli/ExitCode.h"
 #include "control/Card.h"
 #include "fixfiles/DocTypes.h"
 #include "fixfiles/TextDecoding.h"
@@ -9,7 +11,9 @@
 #include "platform/Encoding.h"
 #include "platform/Error.h"
 #include "platform/FileSystem.h"
+#include "platform/TerminalText.h"
 
+#include <chrono>
 #include <cstdio>
 #include <filesystem>
 #include <ostream>
@@ -51,6 +55,11 @@ CivilDate PrintCommand::ParseDay(const std::string& text) {
         std::sscanf(text.c_str(), "%4d-%2d-%2d%c", &year, &month, &day, &tail) != 3 || month < 1 ||
         month > 12 || day < 1 || day > 31 || year < 100)
         throw Error("Not a date (YYYY-MM-DD): " + text);
+    namespace chr = std::chrono;
+    if (!chr::year_month_day(chr::year(year), chr::month(static_cast<unsigned>(month)),
+                             chr::day(static_cast<unsigned>(day)))
+             .ok())
+        throw Error("Not a day of the calendar: " + text);
     return {year, month, day};
 }
 
@@ -67,9 +76,8 @@ int PrintCommand::run(std::ostream& out, std::ostream& err) {
     if (options_.count < 1)
         throw Error("The count must be 1 or more");
     std::string compPath = shared_.Paths.text(Path(options_.compDir));
+    CheckCompanyDir(Path(options_.compDir));
     std::error_code ec;
-    if (!fs::is_directory(ResolvePath(Path(options_.compDir)).native(), ec))
-        throw Error("Company directory not found: " + options_.compDir);
     bool several = options_.count > 1;
     if (several && (options_.out.empty() || !fs::is_directory(options_.out, ec)))
         throw Error("Several pages need --out with an existing folder to write them in");
@@ -105,7 +113,7 @@ int PrintCommand::run(std::ostream& out, std::ostream& err) {
     if (card.PubPrevLocation == 0) {
         err << "dovrel: no document of type " << options_.type << " at or after record "
             << options_.start << '\n';
-        return 1;
+        return kExitNotFound;
     }
 
     if (!several) {

@@ -1,7 +1,9 @@
 #include "app/cli/SettingsCommand.h"
 
+#include "app/cli/ExitCode.h"
 #include "platform/Encoding.h"
 #include "platform/Error.h"
+#include "platform/TerminalText.h"
 
 #include <ostream>
 #include <utility>
@@ -50,7 +52,7 @@ int SettingsCommand::unset(std::ostream& err) {
 
 int SettingsCommand::noSetting(std::ostream& err) const {
     err << "No setting \"" << ToTerminal(key_) << "\" under " << ToTerminal(app_) << '\n';
-    return 1;
+    return kExitNotFound;
 }
 
 } // namespace dovrel

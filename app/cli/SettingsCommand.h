@@ -22,7 +22,7 @@ public:
 
     SettingsCommand(SettingsOptions options, SettingsStore& store);
 
-    // Exit code: 0 done, 1 when `get` or `unset` finds no such key.
+    // Exit code: 0 done, 3 when `get` or `unset` finds no such key.
     int run(std::ostream& out, std::ostream& err);
 
 private:

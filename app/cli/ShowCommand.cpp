@@ -1,5 +1,7 @@
 #include "app/cli/ShowCommand.h"
 
+#include "app/cli/CompanyDir.h"
+#include "app/cli/ExitCode.h"
 #include "app/cli/StateJson.h"
 #include "fixfiles/DateSerial.h"
 #include "fixfiles/DocTypes.h"
@@ -9,6 +11,7 @@
 #include "platform/Error.h"
 #include "platform/FileSystem.h"
 #include "platform/Messages.h"
+#include "platform/TerminalText.h"
 
 #include <algorithm>
 #include <filesystem>
@@ -63,26 +66,26 @@ int ShowCommand::run(std::ostream& out, std::ostream& err) {
         throw Error("The start record must be 1 or more");
     Path compDir(options_.compDir);
     compPath_ = shared_.Paths.text(compDir);
-    std::error_code ec;
-    if (!std::filesystem::is_directory(ResolvePath(compDir).native(), ec))
-        throw Error("Company directory not found: " + compDir.shown());
+    CheckCompanyDir(compDir);
     RecordedMessages messages;
     Card card(messages, shared_);
     watchProgress(card);
     read(card);
-    if (shared_.DocTypes[static_cast<size_t>(row_)].code != options_.type)
-        err << "dovrel: there is no document type " << options_.type << "; showing type "
-            << shared_.DocTypes[static_cast<size_t>(row_)].code << '\n';
     std::vector<RecordedMessages::Shown> shown = messages.take();
     if (options_.json)
         out << StateJson::Dump(StateJson::BuildFromDocument(card), 2) << '\n';
     for (const auto& message : shown)
         err << "dovrel: " << ToTerminal(message.title) << ": " << ToTerminal(message.text) << '\n';
     if (!shown.empty())
-        return 1;
+        return kExitFailed;
+    if (!card.document()) {
+        err << "dovrel: " << kNoDocument << ": no document of type " << options_.type
+            << " at or after record " << options_.start << '\n';
+        return kExitNotFound;
+    }
     if (!options_.json)
         printDocument(card, out);
-    return 0;
+    return kExitDone;
 }
 
 // The control's own start-up and ShowDoc. The start-up's settings are its
@@ -90,6 +93,9 @@ int ShowCommand::run(std::ostream& out, std::ostream& err) {
 void ShowCommand::read(Card& card) {
     card.UserControl_InitProperties(nullptr);
     row_ = DocTypeIndex(shared_.DocTypes, options_.type);
+    if (shared_.DocTypes[static_cast<size_t>(row_)].code != options_.type)
+        throw CommandError(kExitUsage,
+                           "there is no document type " + std::to_string(options_.type));
     int16_t type = options_.type;
     int32_t start = options_.start;
     card.ShowDoc(compPath_, type, start);
@@ -109,13 +115,8 @@ void ShowCommand::watchProgress(Card& card) {
 }
 
 void ShowCommand::printDocument(const Card& card, std::ostream& out) const {
-    // Nothing found is not an error.
-    const std::optional<Document>& document = card.document();
-    if (!document) {
-        out << kNoDocument << '\n';
-        return;
-    }
-    printHeader(*document, out);
+    const Document& document = *card.document();
+    printHeader(document, out);
     out << '\n';
     Grid lines(card.DocLines.name());
     DocumentView::FillLines(lines, &*document);

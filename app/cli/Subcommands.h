@@ -2,7 +2,9 @@
 
 #include <CLI/CLI.hpp>
 
+#include <cstdint>
 #include <functional>
+#include <string>
 
 namespace dovrel {
 
@@ -15,5 +17,11 @@ void AddPrint(CLI::App& app, Runner& run);
 void AddCompanies(CLI::App& app, Runner& run);
 void AddAccount(CLI::App& app, Runner& run);
 void AddPictures(CLI::App& app, Runner& run);
+
+// --type: a document type's code, English name or Hebrew title; the help
+// lists them all, and anything else is a usage error.
+void AddTypeOption(CLI::App& command, int16_t& type);
+// --today YYYY-MM-DD, a real day of the calendar.
+void AddTodayOption(CLI::App& command, std::string& today, const std::string& about);
 
 } // namespace dovrel

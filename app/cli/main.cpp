@@ -1,12 +1,17 @@
+#include "app/cli/ExitCode.h"
 #include "app/cli/HostSession.h"
 #include "app/cli/PrintCommand.h"
 #include "app/cli/SettingsCommand.h"
 #include "app/cli/ShowCommand.h"
 #include "app/cli/Subcommands.h"
+#include "platform/TerminalText.h"
 
 #include <CLI/CLI.hpp>
 
+#include <cerrno>
 #include <cstdint>
+#include <cstdio>
+#include <cstring>
 #include <functional>
 #include <iostream>
 #include <limits>
@@ -22,8 +27,7 @@ void AddShow(CLI::App& app, Runner& run) {
     auto options = std::make_shared<dovrel::ShowOptions>();
     CLI::App* show = app.add_subcommand("show", "Print one document of a company");
     show->add_option("COMPDIR", options->compDir, "Company directory")->required();
-    show->add_option("--type", options->type, "Document type code (default 20)")
-        ->check(CLI::Range(0, static_cast<int>(std::numeric_limits<int16_t>::max())));
+    dovrel::AddTypeOption(*show, options->type);
     show->add_option("--start", options->start, "First record to look at (default 2)")
         ->check(CLI::Range(1, std::numeric_limits<int32_t>::max()));
     show->add_flag("--json", options->json, "Print the control's state as JSON");
@@ -42,7 +46,7 @@ void AddHost(CLI::App& app, Runner& run) {
     auto today = std::make_shared<std::string>();
     CLI::App* host = app.add_subcommand(
         "host", "Automation: one JSON request per input line, one JSON answer per output line");
-    host->add_option("--today", *today, "Today's date on printed pages, YYYY-MM-DD");
+    dovrel::AddTodayOption(*host, *today, "Today's date on printed pages");
     host->callback([today, &run] {
         run = [today] {
             dovrel::ModuleState state;
@@ -77,12 +81,59 @@ void AddSettings(CLI::App& app, Runner& run) {
     });
 }
 
+const char* const kExitCodes =
+    "Exit codes: 0 done, 1 failed, 2 usage (a wrong command line), 3 nothing found (no such "
+    "document, account, company, range or setting).\n";
+
+// A first word that is not a command gets its own message, with the commands.
+bool UnknownCommand(CLI::App& app, int argc, char** argv) {
+    if (argc < 2 || argv[1][0] == '-')
+        return false;
+    std::string word = argv[1];
+    std::string names;
+    for (const CLI::App* command : app.get_subcommands({})) {
+        if (command->get_name() == word)
+            return false;
+        names += (names.empty() ? "" : ", ") + command->get_name();
+    }
+    std::cerr << "dovrel: unknown command \"" << dovrel::TerminalText(word)
+              << "\"; the commands are " << names << " (dovrel --help tells more)\n";
+    return true;
+}
+
+// Everything written to standard output must have reached it.
+int Finish(int code) {
+    std::cout.flush();
+    if (std::cout && std::fflush(stdout) == 0 && !std::ferror(stdout))
+        return code;
+    std::cerr << "dovrel: cannot write the output: " << std::strerror(errno) << '\n';
+    return dovrel::kExitFailed;
+}
+
+int Run(const Runner& run) {
+    try {
+        return Finish(run ? run() : dovrel::kExitUsage);
+    } catch (const dovrel::CommandError& e) {
+        std::cerr << "dovrel: " << dovrel::TerminalText(e.what()) << '\n';
+        return Finish(e.code());
+    } catch (const std::bad_alloc&) {
+        std::cerr << "dovrel: out of memory\n";
+    } catch (const std::exception& e) {
+        std::cerr << "dovrel: " << dovrel::TerminalText(e.what()) << '\n';
+    } catch (...) {
+        std::cerr << "dovrel: unknown failure\n";
+    }
+    Finish(dovrel::kExitFailed);
+    return dovrel::kExitFailed;
+}
+
 } // namespace
 
 int main(int argc, char** argv) {
     CLI::App app{"dovrel: view the stock documents of a company of the accounting system"};
     app.set_version_flag("--version", std::string("dovrel ") + DOVREL_VERSION);
     app.require_subcommand(1);
+    app.footer(kExitCodes);
     Runner run;
     AddShow(app, run);
     AddHost(app, run);
@@ -91,18 +142,13 @@ int main(int argc, char** argv) {
     dovrel::AddCompanies(app, run);
     dovrel::AddAccount(app, run);
     dovrel::AddPictures(app, run);
+    if (UnknownCommand(app, argc, argv))
+        return dovrel::kExitUsage;
     try {
         app.parse(argc, argv);
     } catch (const CLI::ParseError& e) {
         int code = app.exit(e);
-        return code == 0 ? 0 : 2;
+        return code == 0 ? dovrel::kExitDone : dovrel::kExitUsage;
     }
-    try {
-        return run ? run() : 2;
-    } catch (const std::exception& e) {
-        std::cerr << "dovrel: " << e.what() << '\n';
-    } catch (...) {
-        std::cerr << "dovrel: unknown failure\n";
-    }
-    return 1;
+    return Run(run);
 }
