@@ -7,6 +7,7 @@
 #include "pictures/ItemPicsForm.h"
 #include "platform/Encoding.h"
 #include "platform/Error.h"
+#include "platform/SafeFile.h"
 
 namespace dovrel {
 
@@ -35,7 +36,7 @@ private:
 PageSettings Card::preparePage() {
     auto& pics = dynamic_cast<ItemPicsForm&>(form("frmItemPics"));
     shared_.DBPath = pics.txtDBPath.Text();
-    std::string database = shared_.DBPath + "Dovrel.def";
+    std::string database = JoinFolder(shared_.DBPath, "Dovrel.def");
     FillPicPath(database);
     shared_.PicPath = pics.txtPicPath.Text();
     return {shared_.LogoFile, shared_.CompTitle, shared_.PicPath, shared_.PicX, shared_.PicY};

@@ -5,6 +5,7 @@
 #include "pages/Html.h"
 #include "platform/Encoding.h"
 #include "platform/Error.h"
+#include "platform/SafeFile.h"
 
 #include <algorithm>
 #include <charconv>
@@ -95,7 +96,7 @@ std::string DrawingText(const PageContext& context, int32_t row) {
     if (line == nullptr || Trim(line->picFile).empty())
         return "&nbsp;";
     const PageSettings& s = context.settings;
-    return "<img src='" + EscapeHtml(s.picPath + TrimCopy(line->picFile)) + "' width='" +
+    return "<img src='" + EscapeHtml(JoinFolder(s.picPath, TrimCopy(line->picFile))) + "' width='" +
            EscapeHtml(s.picX) + "' height='" + EscapeHtml(s.picY) + "' border='0' align='middle'>";
 }
 

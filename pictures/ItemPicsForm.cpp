@@ -6,6 +6,7 @@
 #include "platform/Error.h"
 #include "platform/FileSystem.h"
 #include "platform/Messages.h"
+#include "platform/SafeFile.h"
 #include "platform/SettingsBinding.h"
 
 #include <climits>
@@ -103,7 +104,7 @@ bool ItemPicsForm::confirm(const char* questionUtf8) const {
 }
 
 std::string ItemPicsForm::settingDbName() const {
-    return settings_.DBPath + PictureDb::kFileName;
+    return JoinFolder(settings_.DBPath, PictureDb::kFileName);
 }
 
 void ItemPicsForm::Load() {
@@ -219,7 +220,7 @@ void ItemPicsForm::reloadGrid() {
 void ItemPicsForm::CmdDelete_Click() {
     if (!CheckDBFile())
         return;
-    std::string dbName = txtDBPath.Text() + PictureDb::kFileName;
+    std::string dbName = JoinFolder(txtDBPath.Text(), PictureDb::kFileName);
     int32_t row = ItemPicLines.Row();
     if (!FileExists(PathFromCp1255(dbName)) || row < ItemPicLines.FixedRows() || row < 1)
         return;
@@ -251,7 +252,7 @@ void ItemPicsForm::CmdUpdate_Click() {
         ranges.push_back(std::move(range));
     }
     try {
-        PictureDb(txtDBPath.Text() + PictureDb::kFileName).replaceAll(ranges);
+        PictureDb(JoinFolder(txtDBPath.Text(), PictureDb::kFileName)).replaceAll(ranges);
     } catch (const std::exception& e) {
         showFailure(e);
         return;

@@ -237,6 +237,7 @@ TEST_F(PictureDbTest, ReCreatingReplacesTheFileOnlyWhenTheNewOneIsComplete) {
     expectKept({});
 
     // A file limit too small for the new database: the old one stays.
+    chmod(file.c_str(), 0644); // the child may run as another user; a re-made file keeps this
     db.replaceAll({R("a", "b", {}, {}, "p")});
     const std::vector<Range> before = db.rangesById();
     EXPECT_THAT(FailureInChild([&] { db.create(false); }, 1024),

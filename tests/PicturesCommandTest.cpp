@@ -70,12 +70,12 @@ TEST_F(PicturesCommandTest, AddsListsFindsAndDeletesRanges) {
     EXPECT_EQ(run("which", {"250", "10"}).out, "pic001.jpg\n");
     Result none = run("which", {"150", ""});
     EXPECT_EQ(std::to_string(none.code) + " " + none.err,
-              "1 No picture for item 150 with category code \"\"\n");
+              "3 No picture for item 150 with category code \"\"\n");
 
     EXPECT_EQ(run("delete", {"1"}).code, 0);
     EXPECT_EQ(run("delete", {"1"}).err, "No range 1 in " + file + "\n");
     EXPECT_THAT(failure("delete", {"x1"}), HasSubstr("Not a range number: x1"));
-    EXPECT_EQ(run("which", {"250", "10"}).code, 1);
+    EXPECT_EQ(run("which", {"250", "10"}).code, 3);
 }
 
 TEST_F(PicturesCommandTest, ImportReplacesEveryRangeOrNothing) {
@@ -93,8 +93,8 @@ TEST_F(PicturesCommandTest, ImportReplacesEveryRangeOrNothing) {
 
     const std::vector<std::pair<std::string, std::string>> refused = {
         {"FromItemKey,ToItemKey,FromCatCode,ToCatCode,PicFile\n,z,,999,y.jpg\n10,20,1,2,x.jpg\n"
-         "10,,1,2,bad.jpg\n",
-         "row 3: the highest item key"},
+         "10,1234567890123,1,2,bad.jpg\n",
+         "row 3: the highest item key (ToItemKey) is longer than 12"},
         {"1,2,3\n", "record 1 has 3 fields, not 5"},
         {"1,2,3,4,\"5\n", "ends inside a quoted field"}};
     for (const auto& [text, reason] : refused) {
@@ -131,7 +131,7 @@ TEST_F(PicturesCommandTest, TheCommandLineReachesTheCommand) {
     EXPECT_EQ(made.code, 0) << made.err;
     EXPECT_EQ(cli({"add", "1", "2", "p.jpg"}).out, "Added range 1\n");
     EXPECT_EQ(cli({"which", "15", "7"}).out, "p.jpg\n");
-    EXPECT_EQ(cli({"delete", "9"}).code, 1);
+    EXPECT_EQ(cli({"delete", "9"}).code, 3);
     EXPECT_EQ(cli({"add", "1"}).code, 2);
 }
 

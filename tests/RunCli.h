@@ -25,10 +25,12 @@ struct CliResult {
 
 // The command with these arguments and standard input, in this process's
 // environment. A command still running after timeoutSeconds is killed.
+// Standard output goes to stdoutPath when one is given (it is not read back).
 inline CliResult RunCli(const std::vector<std::string>& args, const std::string& input = "",
-                        int timeoutSeconds = 60) {
+                        int timeoutSeconds = 60, const std::string& stdoutPath = "") {
     TempDir dir;
-    std::string in = (dir.path() / "in").string(), out = (dir.path() / "out").string(),
+    std::string in = (dir.path() / "in").string(),
+                out = stdoutPath.empty() ? (dir.path() / "out").string() : stdoutPath,
                 err = (dir.path() / "err").string();
     std::ofstream(in, std::ios::binary) << input;
     posix_spawn_file_actions_t files;
@@ -61,7 +63,7 @@ inline CliResult RunCli(const std::vector<std::string>& args, const std::string&
         }
     }
     posix_spawn_file_actions_destroy(&files);
-    result.out = ReadAll(out);
+    result.out = stdoutPath.empty() ? ReadAll(out) : "";
     result.err = ReadAll(err);
     return result;
 }

@@ -35,20 +35,20 @@ protected:
 TEST_F(SettingsCommandTest, SetGetListAndUnsetEachApplicationApart) {
     const std::pair<Args, std::tuple<int, std::string, std::string>> steps[] = {
         {{"list"}, {0, "", ""}},
-        {{"get", "CompPath"}, {1, "", "No setting \"CompPath\" under Dovrel\n"}},
+        {{"get", "CompPath"}, {3, "", "No setting \"CompPath\" under Dovrel\n"}},
         {{"set", "CompPath", "c:\\comp02"}, {0, "", ""}},
         {{"--app", "Dovrel7", "set", "CompPath", "c:\\comp07"}, {0, "", ""}},
         {{"--app", "Dovrel7", "set", "DocType", "3"}, {0, "", ""}},
         {{"list"}, {0, "CompPath=c:\\comp02\n", ""}},
         {{"list", "--app", "dovrel7"}, {0, "CompPath=c:\\comp07\nDocType=3\n", ""}},
         {{"--app", "Dovrel8", "get", "CompPath"},
-         {1, "", "No setting \"CompPath\" under Dovrel8\n"}},
+         {3, "", "No setting \"CompPath\" under Dovrel8\n"}},
         {{"set", "Title", "חשבונית מס"}, {0, "", ""}},
         {{"set", "COMPPATH", "d:\\חברה"}, {0, "", ""}},
         {{"get", "comppath"}, {0, "d:\\חברה\n", ""}},
         {{"list"}, {0, "CompPath=d:\\חברה\nTitle=חשבונית מס\n", ""}},
         {{"unset", "title"}, {0, "", ""}},
-        {{"unset", "Title"}, {1, "", "No setting \"Title\" under Dovrel\n"}},
+        {{"unset", "Title"}, {3, "", "No setting \"Title\" under Dovrel\n"}},
         {{"list"}, {0, "CompPath=d:\\חברה\n", ""}},
     };
     for (const auto& [args, expected] : steps)

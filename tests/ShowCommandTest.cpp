@@ -105,12 +105,10 @@ TEST(ShowCommandTest, PrintsTheFirstDocumentOfTheTypeFromTheStartRecordOrItsStat
     EXPECT_THAT(Show({path, 20, 4, false}).out, HasSubstr("דנה לוי"));
     // Nothing after record 9: the scan's progress shows, then the line is cleared.
     Output none = Show({path, 20, 9, false});
-    EXPECT_EQ(std::tie(none.code, none.out), std::make_tuple(0, "לא נמצא מסמך\n"));
+    EXPECT_EQ(std::tie(none.code, none.out), std::make_tuple(3, ""));
+    EXPECT_THAT(none.err, HasSubstr("לא נמצא מסמך"));
     EXPECT_THAT(none.progress, MatchesRegex("\r[0-9]+%.*\r     \r"));
-    // A code without a document type shows the first type, and says so.
-    Output unknown = Show({path, 8, 2, false});
-    EXPECT_THAT(unknown.err, HasSubstr("no document type 8"));
-    EXPECT_EQ(unknown.out, "לא נמצא מסמך\n");
+    EXPECT_THROW(Show({path, 8, 2, false}), Error); // no document type 8
 
     // As JSON the output is the state the host answers with.
     json state = json::parse(Show({path, 20, 2, true}).out);

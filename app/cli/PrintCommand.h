@@ -33,10 +33,11 @@ public:
     PrintCommand(PrintOptions options, SettingsStore& settings, Browser& browser,
                  ModuleState& shared);
 
-    // Exit code: 0 when every page was written, 1 when none could be.
+    // Exit code: 0 when every page was written, 1 when none could be, 3 when
+    // there is no such document.
     int run(std::ostream& out, std::ostream& err);
 
-    // "YYYY-MM-DD"; an error for anything else.
+    // "YYYY-MM-DD", a day of the calendar; an error for anything else.
     static CivilDate ParseDay(const std::string& text);
     // A file name for a document's page from its reference: letters, digits,
     // "-" and "_" kept, anything else "_"; "document" when nothing is left.

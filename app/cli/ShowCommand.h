@@ -25,8 +25,8 @@ class ShowCommand {
 public:
     ShowCommand(ShowOptions options, ModuleState& shared);
 
-    // Exit code: 0 when the document (or the note that there is none) was
-    // printed, 1 when the reader showed a message box (printed on err).
+    // Exit code: 0 when the document was printed, 1 when the reader showed a
+    // message box (printed on err), 3 when there is no such document.
     int run(std::ostream& out, std::ostream& err);
     // Shows the progress of the file scan on a terminal ("\r" and a percentage).
     void setProgress(std::ostream* terminal) { progress_ = terminal; }
