@@ -287,8 +287,9 @@ int32_t PictureDb::add(PictureRange range) const {
     Statement count(*db, "SELECT count(*) FROM tItemPicture");
     count.step();
     if (count.integer(0) >= static_cast<int64_t>(kMaxRanges))
-        throw Error(std::string(doing) + " " + ResolvePath(path_) + ": it holds " +
-                    std::to_string(kMaxRanges) + " ranges, the most the picture settings can list");
+        throw Error(std::string(doing) + " " + ResolvePath(PathFromCp1255(path_)).shown() +
+                    ": it holds " + std::to_string(kMaxRanges) +
+                    " ranges, the most the picture settings can list");
     if (highest >= INT32_MAX)
         throw Error(std::string(doing) + " " + ResolvePath(PathFromCp1255(path_)).shown() +
                     ": no range number is free");

@@ -27,7 +27,6 @@ namespace {
 namespace fs = std::filesystem;
 using nlohmann::json;
 using test::RunCli;
-using test::W;
 using ::testing::HasSubstr;
 using ::testing::Not;
 
@@ -159,7 +158,7 @@ TEST_F(CommandRulesTest, WhatIsReadIsARegularFileOfBoundedSize) {
         rlimit limit{250'000'000, 250'000'000};
         return setrlimit(RLIMIT_AS, &limit) == 0;
     };
-    std::string comp = W(co.string());
+    Path comp(co.string());
     EXPECT_EQ(
         test::FailureInChild(limited,
                              [&] {

@@ -296,7 +296,7 @@ int PicturesCommand::importFrom(const PictureDb& db, std::ostream& out) const {
                     " the picture settings can list; nothing was changed");
     if (records.empty() && !options_.force)
         throw Error(file + " holds no picture ranges; importing it would delete every range of " +
-                    ResolvePath(db.path()) + ". Give --force to do that");
+                    ResolvePath(PathFromCp1255(db.path())).shown() + ". Give --force to do that");
     std::vector<PictureRange> ranges;
     for (size_t i = 0; i < records.size(); ++i) {
         if (records[i].size() != 5)
