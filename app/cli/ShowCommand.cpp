@@ -119,11 +119,11 @@ void ShowCommand::printDocument(const Card& card, std::ostream& out) const {
     printHeader(document, out);
     out << '\n';
     Grid lines(card.DocLines.name());
-    DocumentView::FillLines(lines, &*document);
+    DocumentView::FillLines(lines, &document);
     printLines(lines, out);
     out << '\n';
-    printTotals(*document, out);
-    printRemarks(*document, out);
+    printTotals(document, out);
+    printRemarks(document, out);
 }
 
 void ShowCommand::printHeader(const Document& document, std::ostream& out) const {
