@@ -7,6 +7,8 @@
 #include "platform/Error.h"
 #include "platform/FileSystem.h"
 
+#include <unicode/unistr.h>
+
 #include <algorithm>
 #include <array>
 #include <filesystem>
@@ -25,16 +27,9 @@ const std::array<char32_t, 256>& CodePoints() {
         std::array<char32_t, 256> table{};
         for (int b = 0; b < 256; ++b) {
             std::string utf8 = ToUtf8(std::string(1, static_cast<char>(b)));
-            char32_t cp = 0;
-            auto lead = static_cast<unsigned char>(utf8[0]);
-            if (utf8.size() == 1)
-                cp = lead;
-            else if (utf8.size() == 2)
-                cp = ((lead & 0x1Fu) << 6) | (static_cast<unsigned char>(utf8[1]) & 0x3Fu);
-            else
-                cp = ((lead & 0x0Fu) << 12) | ((static_cast<unsigned char>(utf8[1]) & 0x3Fu) << 6) |
-                     (static_cast<unsigned char>(utf8[2]) & 0x3Fu);
-            table[static_cast<size_t>(b)] = cp == 0xFFFD ? static_cast<char32_t>(b) : cp;
+            UChar32 cp = icu::UnicodeString::fromUTF8(utf8).char32At(0);
+            table[static_cast<size_t>(b)] =
+                cp == 0xFFFD ? static_cast<char32_t>(b) : static_cast<char32_t>(cp);
         }
         return table;
     }();
