@@ -4,12 +4,12 @@
 #include "platform/Error.h"
 #include "platform/FileSystem.h"
 
-#include <algorithm>
+#include <mntent.h>
+
+#include <cstdio>
 #include <filesystem>
-#include <fstream>
-#include <iterator>
 #include <set>
-#include <sstream>
+#include <vector>
 
 namespace dovrel {
 
@@ -21,21 +21,27 @@ const std::set<std::string, std::less<>> kInternalTypes = {
     "devpts",     "fusectl",     "hugetlbfs", "mqueue", "nsfs",    "proc",     "pstore",
     "rpc_pipefs", "securityfs",  "selinuxfs", "sysfs",  "tracefs", "efivarfs"};
 
-// The mounts table writes space, tab, newline and backslash as \ooo.
-std::string Unescape(const std::string& field) {
-    auto octal = [](char c) { return c >= '0' && c <= '7'; };
-    std::string out;
-    for (size_t i = 0; i < field.size(); ++i) {
-        if (field[i] == '\\' && i + 3 < field.size() && octal(field[i + 1]) &&
-            octal(field[i + 2]) && octal(field[i + 3])) {
-            out += static_cast<char>(((field[i + 1] - '0') << 6) | ((field[i + 2] - '0') << 3) |
-                                     (field[i + 3] - '0'));
-            i += 3;
-        } else {
-            out += field[i];
-        }
+// The mount points of an open mounts table, in code page 1255, "/" first.
+std::vector<std::string> ReadMountPoints(FILE* table) {
+    std::set<std::string> points;
+    // getmntent_r undoes the table's escapes (space, tab, newline,
+    // backslash); the reentrant form keeps two threads' scans apart.
+    std::vector<char> line(16384);
+    mntent entry{};
+    while (table != nullptr &&
+           getmntent_r(table, &entry, line.data(), static_cast<int>(line.size())) != nullptr) {
+        if (kInternalTypes.count(entry.mnt_type) != 0)
+            continue;
+        std::string native = entry.mnt_dir;
+        std::string text = FromUtf8(native);
+        // A mount point the core's code page cannot name could not be opened.
+        if (native.starts_with('/') && ToUtf8(text) == native)
+            points.insert(text);
     }
-    return out;
+    points.erase("/");
+    std::vector<std::string> result{"/"};
+    result.insert(result.end(), points.begin(), points.end());
+    return result;
 }
 
 } // namespace
@@ -67,30 +73,20 @@ void DirListBox::setPath(const std::string& path) {
 }
 
 std::vector<std::string> MountPoints(std::string_view mountsTable) {
-    std::set<std::string> points;
-    std::istringstream lines{std::string(mountsTable)};
-    std::string line;
-    while (std::getline(lines, line)) {
-        std::istringstream fields(line);
-        std::string device, point, type;
-        if (!(fields >> device >> point >> type) || kInternalTypes.count(type) != 0)
-            continue;
-        std::string native = Unescape(point);
-        std::string text = FromUtf8(native);
-        // A mount point the core's code page cannot name could not be opened.
-        if (native.starts_with('/') && ToUtf8(text) == native)
-            points.insert(text);
-    }
-    points.erase("/");
-    std::vector<std::string> result{"/"};
-    result.insert(result.end(), points.begin(), points.end());
-    return result;
+    std::string text(mountsTable);
+    FILE* table = text.empty() ? nullptr : fmemopen(text.data(), text.size(), "r");
+    std::vector<std::string> points = ReadMountPoints(table);
+    if (table != nullptr)
+        fclose(table);
+    return points;
 }
 
 std::vector<std::string> SystemMountPoints() {
-    std::ifstream in("/proc/self/mounts");
-    std::string table{std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>()};
-    return MountPoints(table);
+    FILE* table = setmntent("/proc/self/mounts", "r");
+    std::vector<std::string> points = ReadMountPoints(table);
+    if (table != nullptr)
+        endmntent(table);
+    return points;
 }
 
 } // namespace dovrel
