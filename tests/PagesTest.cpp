@@ -60,7 +60,7 @@ std::vector<std::string> Starting(const std::vector<std::string>& lines,
     return found;
 }
 
-TEST(PagePieces, AsIsCellsCellsRulesAndNumbers) {
+TEST(PagePieces, AsIsCellsCellsAndNumbers) {
     const std::string open =
         "<table cellspacing='0' cellpadding='0' border='0' align='right' dir='rtl'><tr>";
     EXPECT_EQ(AsIsTable(""), open + "</tr></table>");
@@ -70,13 +70,6 @@ TEST(PagePieces, AsIsCellsCellsRulesAndNumbers) {
 
     EXPECT_EQ(RightCell(""), "<td valign='top' align='right'>&nbsp;</td>");
     EXPECT_EQ(RightCell(" "), "<td valign='top' align='right'> </td>");
-
-    EXPECT_EQ(RulesFor(-1), "all");
-    EXPECT_EQ(RulesFor(0), "all");
-    EXPECT_EQ(RulesFor(1), "none");
-    EXPECT_EQ(RulesFor(2), "rows");
-    EXPECT_EQ(RulesFor(3), "cols");
-    EXPECT_EQ(RulesFor(4), "");
 
     EXPECT_EQ(FormatFixed2(0), "0.00");
     EXPECT_EQ(FormatFixed2(0.004), "0.00");

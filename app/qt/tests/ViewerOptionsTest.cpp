@@ -34,8 +34,7 @@ TEST(ViewerOptionsTest, RefusesWhatItCannotUse) {
                               {"--start", "x"},
                               {"--type", "40000"},
                               {"--type", "2.5"},
-                              {"--colour"},
-                              {"--type"}}) {
+                              {"--colour"}}) {
         EXPECT_THROW(Parse(wrong), Error) << wrong.join(' ').toStdString();
     }
 }
