@@ -1,8 +1,8 @@
 #include "platform/SafeFile.h"
 
+#include "platform/Ascii.h"
 #include "platform/Error.h"
 
-#include <algorithm>
 #include <cerrno>
 #include <cstdlib>
 #include <cstring>
@@ -57,10 +57,7 @@ void WriteAll(int fd, std::string_view bytes, const std::string& what, const std
 bool IsAccountingFile(std::string_view path) {
     if (path.size() < 4)
         return false;
-    std::string_view tail = path.substr(path.size() - 4);
-    return std::equal(tail.begin(), tail.end(), ".fix", [](char a, char b) {
-        return (a >= 'A' && a <= 'Z' ? static_cast<char>(a + 32) : a) == b;
-    });
+    return EqualsNoCase(path.substr(path.size() - 4), ".fix");
 }
 
 void CheckWriteTarget(const std::string& path, const std::string& what) {
