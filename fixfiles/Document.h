@@ -12,12 +12,13 @@
 namespace dovrel {
 
 // One text field of a stored document, trimmed, in code page 1255: as stored
-// (the stored visual order, only the Hebrew letters mapped) and as the control
-// shows it (LogicalText). Another form of the same field is one more member,
-// made from `stored`.
+// (the stored visual order, only the Hebrew letters mapped), as the control
+// shows it (LogicalText), and in the order people read it (ReadingOrderText),
+// which is what goes out to people outside the control.
 struct DocumentText {
     std::string stored;
     std::string logical;
+    std::string reading;
 };
 
 // A document as the document reader accepted it: where it lies, its header,

@@ -3,6 +3,7 @@
 #include "fixfiles/DateSerial.h"
 #include "fixfiles/FieldPrefilter.h"
 #include "fixfiles/ProgressBar.h"
+#include "fixfiles/ReadingOrder.h"
 #include "fixfiles/RecordFields.h"
 #include "fixfiles/RecordFile.h"
 #include "fixfiles/TextDecoding.h"
@@ -147,9 +148,10 @@ std::string AccountKeyOf(const unsigned char* header) {
     return TrimCopy(LogicalText(Field(header, 2, 8)));
 }
 
-// A text field as stored (trimmed) and as the control shows it.
+// A text field as stored (trimmed), as the control shows it and as people
+// read it.
 DocumentText TextOf(std::string_view field) {
-    return {MappedLetters(Trim(field)), TrimCopy(LogicalText(field))};
+    return {MappedLetters(Trim(field)), TrimCopy(LogicalText(field)), ReadingOrderText(field)};
 }
 
 // The company's title and currency names; bytes of code 0 (a record never
@@ -162,8 +164,9 @@ void TakeCompany(Document& doc, const CompanyRecord& company) {
     doc.companyTitle = TextOf(blank(company.title()));
     for (size_t i = 0; i < doc.currencyNames.size(); ++i) {
         auto code = static_cast<int16_t>(10 + i);
-        doc.currencyNames[i] = {MappedLetters(Trim(blank(company.currencyName(code - 9)))),
-                                CurrencyNames(code, company).first};
+        std::string name = blank(company.currencyName(code - 9));
+        doc.currencyNames[i] = {MappedLetters(Trim(name)), CurrencyNames(code, company).first,
+                                ReadingOrderText(name)};
     }
 }
 
@@ -369,7 +372,8 @@ void StockScan::accept(const Record& header, const Record& cont, const Date& dat
     doc.file = file_;
     doc.record = view_.PubACTLocation;
     doc.accountKey = TextOf(Field(h, 2, 8));
-    doc.reference = {MappedLetters(Trim(Field(h, 100, 5))), TrimCopy(Field(h, 100, 5))};
+    doc.reference = {MappedLetters(Trim(Field(h, 100, 5))), TrimCopy(Field(h, 100, 5)),
+                     ReadingOrderText(Field(h, 100, 5))};
     doc.customer = TextOf(Field(h, 10, 30));
     doc.address1 = TextOf(Field(h, 40, 30));
     doc.address2 = TextOf(Field(h, 70, 30));
@@ -377,7 +381,8 @@ void StockScan::accept(const Record& header, const Record& cont, const Date& dat
     const std::string_view remarks[3] = {Trim(Field(h, 110, 48)), Trim(Field(c, 5, 48)),
                                          Trim(Field(c, 53, 48))};
     for (size_t i = 0; i < 3; ++i)
-        doc.remarks[i] = {MappedLetters(remarks[i]), LogicalText(remarks[i])};
+        doc.remarks[i] = {MappedLetters(remarks[i]), LogicalText(remarks[i]),
+                          ReadingOrderText(remarks[i])};
     doc.warehouse = c[138];
     doc.discountPercent = DoubleAt(c, 112);
     doc.vatPercent = DoubleAt(c, 128);
