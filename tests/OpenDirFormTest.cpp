@@ -49,13 +49,6 @@ protected:
         card->Click("CmdDir");
     }
     OpenDirForm& chooser() { return dynamic_cast<OpenDirForm&>(*state.Forms.at("frmOpenDir")); }
-    // The messages shown, as "title: text".
-    std::vector<std::string> shown() const {
-        std::vector<std::string> texts;
-        for (const RecordedMessages::Shown& m : messages.shown())
-            texts.push_back(U(m.title) + ": " + U(m.text));
-        return texts;
-    }
 
     TempDir main;
     Connection repainting;
@@ -69,8 +62,9 @@ TEST_F(OpenDirFormTest, ChoosingACompanySetsThePathAndFirstReadsFromIt) {
         EXPECT_EQ(U(form.Msg1.Caption()), "הסריקה הסתיימה. תקתוק כפול לבחירה...");
         form.Click("OKButton"); // nothing chosen yet: a message, and the form stays
         EXPECT_TRUE(form.Visible());
-        EXPECT_EQ(shown(), std::vector<std::string>{"שגיאה: לא בחרת חברה"});
+        ASSERT_EQ(messages.shown().size(), 1u);
         EXPECT_EQ(messages.shown()[0].icon, MsgIcon::Critical);
+        EXPECT_EQ(shown(), std::vector<std::string>{"שגיאה: לא בחרת חברה"});
         form.cmbCompany.setListIndex(1);
         form.Click("OKButton");
         EXPECT_FALSE(form.Visible());
@@ -89,7 +83,7 @@ TEST_F(OpenDirFormTest, ChoosingACompanySetsThePathAndFirstReadsFromIt) {
     card->cmbDocType.setListIndex(13); // delivery notes
     card->Click("FirstButt");
     EXPECT_EQ(card->txtReference1.Text(), "200");
-    EXPECT_EQ(shown().size(), 1u);
+    EXPECT_TRUE(shown().empty());
 
     // Double-clicking an entry confirms it as OK does.
     forms.user = [](OpenDirForm& form) {
@@ -166,7 +160,6 @@ TEST(OpenDirFormLoadTest, ADriveThatIsNotThereLeavesTheFirstAndADriveChangeMoves
     EXPECT_EQ(form.MainDir.Path(), FromUtf8(other.str()));
     EXPECT_EQ(form.cmbCompany.ListCount(), 0);
     EXPECT_EQ(U(form.Msg1.Caption()), "לחץ על חפש חברות חשבשבת לאיתור החברות");
-    EXPECT_EQ(U(form.findControl("cmdFindWizComp")->Caption()), "לחץ כאן לחיפוש חברות חשבשבת...");
     // A drive that cannot be opened: an error while the form is hidden, a
     // message while it is shown; the tree stays.
     EXPECT_THROW(form.PathDrive.setListIndex(2), Error);

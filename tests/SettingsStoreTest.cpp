@@ -20,7 +20,6 @@
 #include <functional>
 #include <memory>
 #include <optional>
-#include <thread>
 #include <type_traits>
 
 namespace dovrel {
@@ -128,27 +127,37 @@ TEST_F(SqliteStoreTest, TwoConnectionsOnOneFileTheLastSaveWinsKeyByKey) {
     for (SqliteSettingsStore* s : {&store, &other})
         EXPECT_THAT(s->ListSettings("Dovrel", "Params"),
                     ElementsAre(Pair("CompPath", "b2"), Pair("Title", "a2")));
+}
 
-    // Saves from two threads at once wait for each other instead of failing.
-    auto saveMany = [this](const std::string& prefix) {
-        SqliteSettingsStore own(file.string());
-        for (int i = 0; i < 25; ++i)
-            own.SaveSetting("Busy", "Params", prefix + std::to_string(i), prefix);
-    };
-    std::thread first(saveMany, "x"), second(saveMany, "y");
-    first.join();
-    second.join();
-    EXPECT_EQ(store.ListSettings("Busy", "Params").size(), 50u);
+// Twenty processes save a setting at once into a store that is not there yet.
+TEST(SqliteStoreRaceTest, ManyProcessesMakeTheStoreAtOnceAndEachSaveWaitsItsTurn) {
+    test::TempDir dir;
+    std::string path = (dir.path() / "store" / "settings.db").string();
+    std::vector<pid_t> children;
+    for (int i = 0; i < 20; ++i) {
+        pid_t child = fork();
+        if (child == 0) {
+            try {
+                SqliteSettingsStore(path).SaveSetting("Dovrel", "Params", "K" + std::to_string(i),
+                                                      "v");
+                _exit(0);
+            } catch (...) {
+                _exit(1);
+            }
+        }
+        children.push_back(child);
+    }
+    for (pid_t child : children) {
+        int status = -1;
+        waitpid(child, &status, 0);
+        EXPECT_TRUE(WIFEXITED(status) && WEXITSTATUS(status) == 0);
+    }
+    EXPECT_EQ(SqliteSettingsStore(path).ListSettings("Dovrel", "Params").size(), 20u);
 }
 
 TEST_F(SqliteStoreTest, DefaultPathFollowsTheXdgRules) {
-    auto keep = [](const char* name) {
-        const char* value = std::getenv(name);
-        return value ? std::optional<std::string>(value) : std::nullopt;
-    };
-    std::optional<std::string> config = keep("XDG_CONFIG_HOME"), home = keep("HOME");
+    test::ScopedEnv home("HOME", "/home/dana"), config("XDG_CONFIG_HOME", "");
     const std::string dana = "/home/dana/.config/dovrel/settings.db";
-    setenv("HOME", "/home/dana", 1);
     for (auto [xdg, expected] : {std::pair{"/srv/conf/", "/srv/conf/dovrel/settings.db"},
                                  {"relative/conf", dana.c_str()},
                                  {"", dana.c_str()}}) {
@@ -157,8 +166,6 @@ TEST_F(SqliteStoreTest, DefaultPathFollowsTheXdgRules) {
     }
     unsetenv("XDG_CONFIG_HOME");
     EXPECT_EQ(SqliteSettingsStore().path(), dana);
-    for (auto [name, value] : {std::pair{"XDG_CONFIG_HOME", config}, std::pair{"HOME", home}})
-        value ? setenv(name, value->c_str(), 1) : unsetenv(name);
 }
 
 TEST_F(SqliteStoreTest, ADamagedFileOrADirectoryIsAnErrorNamingTheFile) {

@@ -11,11 +11,13 @@
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
 
+#include <cstdlib>
 #include <filesystem>
 #include <fstream>
 #include <functional>
 #include <iterator>
 #include <memory>
+#include <optional>
 #include <random>
 #include <string>
 #include <string_view>
@@ -43,6 +45,23 @@ public:
 
 private:
     std::filesystem::path path_;
+};
+
+// An environment variable set for the life of the object, then put back.
+class ScopedEnv {
+public:
+    ScopedEnv(const char* name, const std::string& value) : name_(name) {
+        if (const char* old = std::getenv(name))
+            saved_ = old;
+        setenv(name, value.c_str(), 1);
+    }
+    ~ScopedEnv() { saved_ ? setenv(name_, saved_->c_str(), 1) : unsetenv(name_); }
+    ScopedEnv(const ScopedEnv&) = delete;
+    ScopedEnv& operator=(const ScopedEnv&) = delete;
+
+private:
+    const char* name_;
+    std::optional<std::string> saved_;
 };
 
 // A company directory written from a JSON description (tools/README.md).
@@ -156,6 +175,14 @@ template <class F = Form> struct CardDesk {
     FixedClock clock{{2026, 12, 6}};
     CardServices services{messages, settings, forms, clipboard, browser, clock};
     ModuleState state;
+
+    // The messages shown since the last look, as "title: text".
+    std::vector<std::string> shown() {
+        std::vector<std::string> texts;
+        for (const RecordedMessages::Shown& m : messages.take())
+            texts.push_back(ToUtf8(m.title) + ": " + ToUtf8(m.text));
+        return texts;
+    }
 };
 
 } // namespace dovrel::test
