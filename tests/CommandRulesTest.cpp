@@ -1,12 +1,10 @@
 // The rules every command keeps, checked over every command that writes,
 // reads, prints or exits: a command added later joins these tables.
 
-#include "ChildFailure.h"
 #include "RunCli.h"
 #include "TestCompany.h"
 #include "fixfiles/AccountsFile.h"
 #include "platform/Controls.h"
-#include "platform/SettingsStore.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -14,8 +12,6 @@
 
 #include <sys/resource.h>
 #include <sys/stat.h>
-#include <sys/wait.h>
-#include <unistd.h>
 
 #include <filesystem>
 #include <fstream>
@@ -37,8 +33,6 @@ const char* const kControls = "41 09 42 0A 43 0D 44 7F 45 1B 9C 9D 9E 9F";
 class CommandRulesTest : public ::testing::Test {
 protected:
     CommandRulesTest() {
-        setenv("XDG_CONFIG_HOME", (root.path() / "config").c_str(), 1);
-        setenv("TMPDIR", root.str().c_str(), 1);
         json hostile = {{"hex", kControls}};
         json company = {
             {"company", {{"name", hostile}, {"title", hostile}}},
@@ -54,14 +48,12 @@ protected:
         EXPECT_EQ(RunCli({"pictures", "--db", db(), "init"}).code, 0);
         EXPECT_EQ(RunCli({"pictures", "--db", db(), "add", "A", "B", "a\tb\x1b[2J.jpg"}).code, 0);
     }
-    ~CommandRulesTest() override {
-        unsetenv("XDG_CONFIG_HOME");
-        unsetenv("TMPDIR");
-    }
     std::string db() const { return (root.path() / "db").string(); }
     std::string at(const std::string& name) const { return (root.path() / name).string(); }
 
     test::TempDir root;
+    test::ScopedEnv config{"XDG_CONFIG_HOME", (root.path() / "config").string()};
+    test::ScopedEnv tmp{"TMPDIR", root.str()};
     fs::path co = root.path() / "main" / "co";
 };
 
@@ -207,6 +199,7 @@ TEST_F(CommandRulesTest, EveryCommandExitsWithTheSameCodes) {
         {{"print", co.string(), "--today", "2023-02-31"}, 2, "2023-02-31"},
         {{"pictures", "--db", db(), "add", "A", "B", "01", "f"}, 2, "Usage"},
         {{"pictures", "--db", db(), "import", "a.csv", "b.csv"}, 2, ""},
+        {{"settings", "get"}, 2, ""},
         {{"show", co.string(), "--start", "60"}, 3, "לא נמצא מסמך"},
         {{"show", co.string(), "--start", "60", "--json"}, 3, "לא נמצא מסמך"},
         {{"print", co.string(), "--start", "60", "--no-open"}, 3, "no document"},
@@ -216,6 +209,7 @@ TEST_F(CommandRulesTest, EveryCommandExitsWithTheSameCodes) {
         {{"settings", "get", "NoSuchKey"}, 3, "No setting"},
         {{"pictures", "--db", db(), "delete", "99"}, 3, "No range 99"},
         {{"pictures", "--db", db(), "import", missing}, 1, missing + ": No such file"},
+        {{"companies", missing}, 1, missing},
         {{"pictures", "--db", db(), "add", "", "", "x"}, 1, "is empty"},
         {{"show", co.string(), "--type", "Delivery Note"}, 0, ""},
         {{"show", co.string(), "--type", "תעודת משלוח"}, 0, ""}};
@@ -247,31 +241,6 @@ TEST_F(CommandRulesTest, EveryCommandExitsWithTheSameCodes) {
     for (const auto& [args, words] : helps)
         EXPECT_THAT(RunCli(args).out, HasSubstr(words)) << args[0];
     EXPECT_THAT(RunCli({"print", "--help"}).out, Not(HasSubstr("{false}")));
-}
-
-// Twenty processes save a setting at once into a store that is not there yet.
-TEST_F(CommandRulesTest, ManyProcessesMakeTheSettingsStoreAtOnce) {
-    std::string path = at("store/settings.db");
-    std::vector<pid_t> children;
-    for (int i = 0; i < 20; ++i) {
-        pid_t child = fork();
-        if (child == 0) {
-            try {
-                SqliteSettingsStore(path).SaveSetting("Dovrel", "Params", "K" + std::to_string(i),
-                                                      "v");
-                _exit(0);
-            } catch (...) {
-                _exit(1);
-            }
-        }
-        children.push_back(child);
-    }
-    for (pid_t child : children) {
-        int status = -1;
-        waitpid(child, &status, 0);
-        EXPECT_TRUE(WIFEXITED(status) && WEXITSTATUS(status) == 0);
-    }
-    EXPECT_EQ(SqliteSettingsStore(path).ListSettings("Dovrel", "Params").size(), 20u);
 }
 
 } // namespace

@@ -1,7 +1,6 @@
 // `dovrel pictures`: the picture ranges without the desktop.
 
 #include "app/cli/PicturesCommand.h"
-#include "RunCli.h"
 #include "TestCompany.h"
 #include "platform/Error.h"
 
@@ -75,6 +74,7 @@ TEST_F(PicturesCommandTest, AddsListsFindsAndDeletesRanges) {
     EXPECT_EQ(run("delete", {"1"}).code, 0);
     EXPECT_EQ(run("delete", {"1"}).err, "No range 1 in " + file + "\n");
     EXPECT_THAT(failure("delete", {"x1"}), HasSubstr("Not a range number: x1"));
+    EXPECT_EQ(run("add", {"c", "d", "q.jpg"}).out, "Added range 3\n"); // numbers are not reused
     EXPECT_EQ(run("which", {"250", "10"}).code, 3);
 }
 
@@ -120,19 +120,6 @@ TEST_F(PicturesCommandTest, TheFolderComesFromTheSettingsAndAForeignFileIsKept) 
     force = true;
     EXPECT_EQ(run("init").code, 0);
     EXPECT_EQ(run("list").out, kHeader);
-}
-
-TEST_F(PicturesCommandTest, TheCommandLineReachesTheCommand) {
-    auto cli = [&](std::vector<std::string> args) {
-        args.insert(args.begin(), {"pictures", "--db", dir.str()});
-        return test::RunCli(args);
-    };
-    test::CliResult made = cli({"init"});
-    EXPECT_EQ(made.code, 0) << made.err;
-    EXPECT_EQ(cli({"add", "1", "2", "p.jpg"}).out, "Added range 1\n");
-    EXPECT_EQ(cli({"which", "15", "7"}).out, "p.jpg\n");
-    EXPECT_EQ(cli({"delete", "9"}).code, 3);
-    EXPECT_EQ(cli({"add", "1"}).code, 2);
 }
 
 } // namespace

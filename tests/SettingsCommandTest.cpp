@@ -3,7 +3,6 @@
 
 #include <gtest/gtest.h>
 
-#include <cstdlib>
 #include <fstream>
 #include <string>
 #include <tuple>
@@ -20,9 +19,9 @@ using Args = std::vector<std::string>;
 class SettingsCommandTest : public ::testing::Test {
 protected:
     test::TempDir config;
+    test::ScopedEnv home{"XDG_CONFIG_HOME", config.str()};
 
     std::tuple<int, std::string, std::string> run(const Args& args) {
-        setenv("XDG_CONFIG_HOME", config.str().c_str(), 1);
         Args words{"settings"};
         words.insert(words.end(), args.begin(), args.end());
         test::CliResult result = test::RunCli(words);
@@ -56,13 +55,7 @@ TEST_F(SettingsCommandTest, SetGetListAndUnsetEachApplicationApart) {
     EXPECT_TRUE(std::filesystem::is_regular_file(config.path() / "dovrel" / "settings.db"));
 }
 
-TEST_F(SettingsCommandTest, UsageErrorsAndADamagedStoreExitWithTheirCodes) {
-    for (const Args& args :
-         {Args{}, {"get"}, {"set", "CompPath"}, {"frobnicate"}, {"list", "extra"}}) {
-        auto [code, out, err] = run(args);
-        EXPECT_EQ(code, 2) << ::testing::PrintToString(args);
-        EXPECT_NE(err, "");
-    }
+TEST_F(SettingsCommandTest, ADamagedStoreIsAFailureThatNamesTheFile) {
     std::filesystem::create_directories(config.path() / "dovrel");
     std::string file = (config.path() / "dovrel" / "settings.db").string();
     std::ofstream(file, std::ios::binary) << std::string(2000, '#');
