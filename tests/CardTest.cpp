@@ -4,7 +4,6 @@
 #include "control/Card.h"
 #include "TestCompany.h"
 #include "control/CardInterface.h"
-#include "control/Surface.h"
 #include "platform/Error.h"
 #include "platform/SettingsStore.h"
 
@@ -13,7 +12,6 @@
 
 #include <filesystem>
 #include <map>
-#include <set>
 #include <sstream>
 #include <thread>
 #include <tuple>
@@ -112,10 +110,6 @@ TEST_F(CardTest, StartUpShowsTheDefaultsOrWhatThePageNames) {
     EXPECT_EQ(state.CompDir, "c:\\comp02");
     EXPECT_EQ(Params(*card), (std::vector<std::string>{"c:\\comp02", "1", "", "0", "1", "0", "0",
                                                        "1", "0", "0", "01/01/1980"}));
-    ASSERT_EQ(card->cmbDocType.ListCount(), 26);
-    EXPECT_EQ(U(card->cmbDocType.List(13)), "תעודת משלוח");
-    EXPECT_EQ(U(card->CmbDocLang.Text()), "אנגלית");
-    EXPECT_EQ(U(card->cmbRules.Text()), "רשת מלאה");
     EXPECT_EQ(card->PubACTLocation, 2);
     EXPECT_EQ(std::make_pair(card->DocLines.Rows(), card->DocLines.Cols()), std::make_pair(2, 8));
     EXPECT_EQ(shown(*card), "");
@@ -141,24 +135,6 @@ TEST_F(CardTest, StartUpShowsTheDefaultsOrWhatThePageNames) {
     settings.SaveSetting("Dovrel", "Params", "FromDate", "02/02/2020");
     EXPECT_EQ(make(state, &broken)->txtFromDate.Text(), "02/02/2020");
     EXPECT_EQ(state.AppName, "Dovrel");
-}
-
-TEST_F(CardTest, SurfaceNamesEveryControlOnceWithItsCaption) {
-    auto card = make(state);
-    std::set<std::string> names;
-    for (const ControlDesign& design : CardSurface()) {
-        SCOPED_TRACE(design.name);
-        EXPECT_TRUE(names.insert(design.name).second);
-        Control* control = card->findControl(design.name);
-        ASSERT_NE(control, nullptr);
-        EXPECT_EQ(control->kind(), design.kind);
-        EXPECT_LE(design.left + design.width, kCardDesignWidth);
-        EXPECT_LE(design.top + design.height, kCardDesignHeight);
-        EXPECT_TRUE(design.labelFor.empty() || FindDesign(design.labelFor));
-    }
-    // The abbreviation sign is an ordinary quotation mark inside the caption.
-    EXPECT_EQ(U(card->findControl("lblItemKey")->Caption()), ":חיפוש מק\"ט");
-    EXPECT_EQ(card->findControl("NoSuchControl"), nullptr);
 }
 
 TEST_F(CardTest, SavedSettingsComeBackInTheNextControl) {
@@ -313,15 +289,6 @@ TEST_F(CardTest, ResetsEndTheSearchAndRestartTheWalk) {
     card->SetCompDir(Variant::Null());
     EXPECT_EQ(card->SetCompDir(), Variant(""));
     EXPECT_EQ(card->txtCompPath.Text(), "");
-
-    // The company chooser, even cancelled, resets position and search.
-    card->SetCompDir(Variant(company.compPath()));
-    card->DblClick("Label2");
-    card->Click("CmdDir");
-    EXPECT_EQ(card->PubSearchBy, "");
-    EXPECT_EQ(card->PubACTLocation, 2);
-    card->Click("CmdParams");
-    EXPECT_EQ(forms.shown, (std::vector<std::string>{"frmOpenDir", "frmItemPics"}));
 }
 
 TEST_F(CardTest, MembersConvertTheirValuesOrFailLeavingTheirState) {

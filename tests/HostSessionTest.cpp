@@ -92,10 +92,8 @@ TEST_F(HostSessionTest, SetAndGetRoundTripEachKind) {
     }
     EXPECT_EQ(session.card().PubSearchValue, Variant(true));
     // Texts come in as UTF-8 and are held in code page 1255.
-    json reply = ask({"set", "txtItemKey", "מק\"ט 7"});
-    EXPECT_EQ(reply["state"]["controls"]["txtItemKey"], "מק\"ט 7");
+    EXPECT_EQ(ask({"set", "txtItemKey", "מק\"ט 7"})["state"]["controls"]["txtItemKey"], "מק\"ט 7");
     EXPECT_EQ(session.card().txtItemKey.Text(), test::W("מק\"ט 7"));
-    EXPECT_EQ(ask({"get", "txtItemKey"})["value"], "מק\"ט 7");
 }
 
 // Every byte of the code page is its own character in the JSON, control
@@ -172,15 +170,6 @@ TEST_F(HostSessionTest, ReadsAnswerResultControlsGridDocumentAndAccounts) {
     fails({"ReadACT", path + "/nothing-here"}, "ACT.fix");
 }
 
-// The demo's import order is in the company's own currency (code 11): its
-// name shows from the first document on, before anything is printed.
-TEST_F(HostSessionTest, TheStateShowsTheCompanysCurrencyNameBeforeAnyPrint) {
-    json reply = ask({"call", "ShowDoc", DOVREL_DEMO_DIR, 35, 2});
-    ASSERT_EQ(reply["ok"], true) << reply;
-    EXPECT_EQ(reply["state"]["grid"][1][6], "יואן");
-    EXPECT_EQ(reply["messages"], json::array());
-}
-
 TEST_F(HostSessionTest, MissingDocumentFileAnswersTheMessageBoxOnce) {
     TestCompany company(R"({"company": {"title": "x"}})");
     ask({"set", "txtCustomerName", "קודם"});
@@ -215,15 +204,11 @@ TEST_F(HostSessionTest, TwoControlsOnOneThreadShareTheCompanyNotThePosition) {
               json({"Dovrel5", "1001"}));
     EXPECT_EQ(ask({"call", "ShowDoc", path, 20, 2})["result"], 0);
     EXPECT_EQ(ask({"use", 2})["error"], "There is no control 2; make it with new2");
-    // The second control's start-up loads the settings.
-    json second = ask({"new2"})["state"];
-    EXPECT_EQ(json({second["PubACTLocation"], second["CompDir"]}), json({2, "c:\\comp02"}));
+    // The second control's start-up loads the settings; the requests go to it until "use".
+    EXPECT_EQ(ask({"new2"})["state"]["CompDir"], "c:\\comp02");
     ask({"call", "SetCompDir", path});
-    ask({"set", "cmbDocType", 13});
-    EXPECT_EQ(ask({"click", "LastButt"})["state"]["controls"]["txtCustomerName"], "משה כהן");
-    json first = ask({"use", 1})["state"];
-    EXPECT_EQ(json({first["PubACTLocation"], first["CompDir"]}), json({2, path}));
-    EXPECT_EQ(ask({"call", "SetCompDir"})["result"], path);
+    EXPECT_EQ(ask({"call", "ACTLocation", 9})["state"]["PubACTLocation"], 9);
+    EXPECT_EQ(ask({"use", 1})["state"]["PubACTLocation"], 2);
     fails({"use", 3}, "from 1 to 2");
 }
 
@@ -232,10 +217,7 @@ TEST_F(HostSessionTest, CallsEventsAndTypedTextReachTheControl) {
     std::string path = company.path().string();
     ask({"call", "ShowDoc", path, 20, 1});
     fails({"call", "ACTLocation", "abc"}, "Type mismatch");
-    EXPECT_EQ(ask({"call", "ACTLocation"})["result"], 2);
     EXPECT_EQ(ask({"call", "ACTLocation", 7.5})["state"]["PubACTLocation"], 8);
-    ask({"set", "cmbRules", 1});
-    EXPECT_EQ(ask({"call", "RulesValue"})["result"], "none");
     // Typing a company path resets the position; typing the same one does not.
     ask({"set", "txtCompPath", path});
     EXPECT_EQ(ask({"state"})["state"]["PubACTLocation"], 8);
@@ -330,13 +312,12 @@ TEST_F(HostSessionTest, TheChooserAndTheAccountWindowAreScripted) {
 
 TEST_F(HostSessionTest, PrintingOpensThePageAndFormGridsTakeTyping) {
     test::TempDir temp;
-    setenv("TMPDIR", temp.str().c_str(), 1);
+    test::ScopedEnv tmp("TMPDIR", temp.str());
     TestCompany company(kCompany);
     session.setToday({2026, 3, 4});
     ask({"call", "ShowDoc", company.path().string(), 20, 2});
     ask({"set", "CmbDocLang", 1});
     json printed = ask({"click", "PrintButt"});
-    unsetenv("TMPDIR");
     ASSERT_EQ(printed["opened"].size(), 1u) << printed;
     std::string page = test::ReadAll(printed["opened"][0].get<std::string>());
     EXPECT_NE(page.find("<Font class=TD1>03-04-2026</Font>"), std::string::npos);
