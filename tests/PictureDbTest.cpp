@@ -221,13 +221,6 @@ TEST_F(PictureDbTest, ASaveIsWholeOrNothingAndNamesTheRefusedRow) {
     EXPECT_EQ(after[1], (Range{2, "2", "3", "4", "5", "y"}));
     db.replaceAll({});
     EXPECT_TRUE(db.rangesById().empty());
-
-    EXPECT_EQ(db.add(R("a", "b", {}, {}, "p")), 1);
-    EXPECT_EQ(db.add(R("c", "d", {}, {}, "q")), 2);
-    EXPECT_TRUE(db.remove(1));
-    EXPECT_FALSE(db.remove(1));
-    EXPECT_EQ(db.add(R("e", "f", {}, {}, "r")), 3);
-    EXPECT_THAT(FailureOf([&] { db.add(R("", "f", {}, {}, "r")); }), HasSubstr("is empty"));
 }
 
 TEST_F(PictureDbTest, ReCreatingReplacesTheFileOnlyWhenTheNewOneIsComplete) {
