@@ -2,9 +2,7 @@
 // regular files where a data file should be, huge counts and every byte value
 // in every text field.
 
-#include "RunCli.h"
 #include "TestCompany.h"
-#include "app/cli/ShowCommand.h"
 #include "app/cli/StateJson.h"
 #include "control/Card.h"
 #include "platform/Error.h"
@@ -39,12 +37,6 @@ json OneDocument(const std::string& reference) {
     return company;
 }
 
-// A command that hangs on a hostile path is killed after 30 seconds (-2).
-test::CliResult Show(const std::string& path, const std::string& option = "") {
-    return option.empty() ? test::RunCli({"show", path}, "", 30)
-                          : test::RunCli({"show", path, option}, "", 30);
-}
-
 class HostileInputTest : public ::testing::Test {
 protected:
     // Reads the first delivery note of the company path (UTF-8).
@@ -75,9 +67,6 @@ TEST_F(HostileInputTest, CompanyPathsWithSpacesQuotesDotsAndOddLetters) {
             EXPECT_EQ(U(card.txtReference1.Text()), "7") << path;
             EXPECT_TRUE(messages.take().empty()) << path;
         }
-        auto [code, out, err] = Show(plain);
-        EXPECT_EQ(code, 0) << err;
-        EXPECT_THAT(out, HasSubstr("משה \"כהן\" & בנו"));
     }
 }
 
@@ -121,20 +110,6 @@ TEST_F(HostileInputTest, ThingsThatAreNotACompanyOrNotARegularFileAreRefused) {
             EXPECT_THAT([&] { (card.*reader)(path); },
                         ::testing::ThrowsMessage<Error>(HasSubstr("not a regular file")))
                 << dir;
-    }
-
-    // The command says the same and ends, without waiting on the pipe or
-    // reading the device.
-    const std::string missing = std::string("dovrel: שגיאה: ") + kMissing + "\n";
-    const std::pair<std::string, ::testing::Matcher<std::string>> commands[] = {
-        {fifo.string(), missing},
-        {device.string(), missing},
-        {(good / "ISHP.FIX").string(), HasSubstr("Company directory not found")},
-        {std::string(), HasSubstr("Company directory not found")}};
-    for (const auto& [dir, error] : commands) {
-        auto [code, out, err] = Show(dir);
-        EXPECT_EQ(code, dir.starts_with(good.string()) || dir.empty() ? 3 : 1) << dir;
-        EXPECT_THAT(err, error) << dir;
     }
 }
 
@@ -208,25 +183,6 @@ TEST_F(HostileInputTest, EveryByteValueInEveryTextFieldAndHugeLineCounts) {
         stateIsUtf8();
     }
     EXPECT_TRUE(messages.shown().empty()) << U(messages.shown().back().text);
-
-    // A count of 255 that runs over the next documents takes their lines as
-    // its own, up to the limit of 40, and then says so.
-    json runOver = json::array();
-    for (int d = 0; d < 45; ++d)
-        runOver.push_back({{"type", 20}, {"lines", {{{"key", "K"}, {"price", 1}}}}});
-    runOver[0]["lineCount"] = 255;
-    test::TestCompany over(json{{"documents", runOver}}.dump());
-    card.PubSearchBy.clear();
-    EXPECT_EQ(read(over.path().string()), 0);
-    ASSERT_EQ(messages.shown().size(), 1u);
-    EXPECT_THAT(messages.take().back().text, HasSubstr("more than 40 lines"));
-    EXPECT_EQ(card.ProgressFill.Width(), 0);
-    stateIsUtf8();
-
-    // The command prints them as UTF-8 too.
-    auto [code, out, err] = Show(path, "--json");
-    EXPECT_EQ(code, 0) << err;
-    EXPECT_NO_THROW(json::parse(out).dump());
 }
 
 } // namespace

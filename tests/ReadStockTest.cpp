@@ -352,6 +352,7 @@ TEST_F(ReadStockTest, RunTimeErrorsAreReportedWithResultZero) {
         EXPECT_EQ(card->ProgressFill.Width(), 0) << what;
     };
     expectReported(read("First"), "41 lines");
+    EXPECT_NE(lastMessage().find("more than 40 lines"), std::string::npos);
     // A NaN price, line numbers 41 and 0, an amount too large.
     for (const char* reference : {"3", "4", "5", "6"}) {
         search("Reference1", reference);

@@ -11,6 +11,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <filesystem>
 #include <fstream>
 
@@ -21,22 +22,29 @@ namespace fs = std::filesystem;
 
 using test::WriteNumbered;
 
-TEST(RecordFileTest, ReadsRecordsForwardAndBackwardAcrossBlocks) {
+// The walks the document reader makes: backward, with looks ahead at each
+// document's later records, over blocks that records straddle.
+TEST(RecordFileTest, BackwardWalksThatLookAheadReadEveryRecordRight) {
     test::TempDir dir;
     fs::path path = dir.path() / "DATA.FIX";
-    WriteNumbered(path, 100, 7, 3);
-    RecordFile file(Path(path.string()), 7, 50); // blocks of 50 bytes: records straddle them
-    EXPECT_EQ(file.length(), 703);
-    for (int i = 1; i <= 200; ++i) {
-        int r = i <= 100 ? i : 201 - i; // forward, then backward
-        const char* rec = reinterpret_cast<const char*>(file.record(r));
-        ASSERT_NE(rec, nullptr) << r;
-        EXPECT_EQ(std::string(rec, 7), std::string(7, static_cast<char>(r))) << r;
+    WriteNumbered(path, 300, 7, 3);
+    for (size_t blockSize : {7, 20, 50, 64, 1000}) {
+        RecordFile file(Path(path.string()), 7, blockSize);
+        EXPECT_EQ(file.length(), 2103);
+        for (int r = 300; r >= 1; --r) {
+            // As a header at r: its continuation and a few lines after it.
+            for (int ahead = r; ahead <= std::min(300, r + (r % 5)); ++ahead) {
+                const char* rec = reinterpret_cast<const char*>(file.record(ahead));
+                ASSERT_NE(rec, nullptr) << blockSize << " " << r << " " << ahead;
+                ASSERT_EQ(std::string(rec, 7), std::string(7, static_cast<char>(ahead % 251)))
+                    << blockSize << " " << r << " " << ahead;
+            }
+        }
+        for (int64_t past : {int64_t{301}, int64_t{1000000}, INT64_MAX}) // 301: three bytes
+            EXPECT_EQ(file.record(past), nullptr) << past;
+        EXPECT_THROW(file.record(0), Error);
+        EXPECT_THROW(file.record(-7), Error);
     }
-    for (int64_t past : {int64_t{101}, int64_t{1000000}, INT64_MAX}) // 101: three bytes
-        EXPECT_EQ(file.record(past), nullptr) << past;
-    EXPECT_THROW(file.record(0), Error);
-    EXPECT_THROW(file.record(-7), Error);
 }
 
 TEST(RecordFileTest, AFileThatShrinksWhileReadIsReadAsItIsNow) {
