@@ -11,7 +11,6 @@
 
 #include <filesystem>
 #include <fstream>
-#include <utility>
 
 namespace dovrel {
 namespace {
@@ -50,14 +49,10 @@ TEST(CompaniesTest, TheSortOrdersByCodePointAndLeavesEqualNamesWhereItPutsThem) 
         field.resize(kCompanyNameField, ' ');
         return CompanyEntry{path, field};
     };
-    // The middle entry is the pivot; its equal neighbour is swapped past it.
-    std::vector<CompanyEntry> table = {entry("B", "p0"), entry("A", "p1"), entry("A", "p2")};
-    SortCompanies(table, 0, 2);
-    EXPECT_EQ(Paths(table), (std::vector<std::string>{"p2", "p1", "p0"}));
-
     // Code points, not bytes: the euro sign (byte 0x80) comes after alef (0xE0);
-    // a blank name comes first.
-    table = {entry("\x80", "euro"), entry("\xE0", "alef"), entry("", "blank"), entry("z", "z")};
+    // a blank name comes first. (Equal names: the scan below.)
+    std::vector<CompanyEntry> table = {entry("\x80", "euro"), entry("\xE0", "alef"),
+                                       entry("", "blank"), entry("z", "z")};
     SortCompanies(table, 0, 3);
     EXPECT_EQ(Paths(table), (std::vector<std::string>{"blank", "z", "alef", "euro"}));
 
@@ -139,21 +134,6 @@ TEST(CompaniesTest, TheDirectoryTreeShowsOnlyDirectoriesThatExist) {
     for (std::string bad : {std::string(), dir.str() + "/missing", dir.str() + "/file"})
         EXPECT_THROW(tree.setPath(FromUtf8(bad)), Error) << bad;
     EXPECT_EQ(tree.Path(), FromUtf8(dir.str()));
-}
-
-TEST(CompaniesTest, ATextBoxSelectionStaysInsideItsText) {
-    TextBox box("txtPhone", "03-1234567");
-    box.setSelStart(3);
-    box.setSelLength(100);
-    EXPECT_EQ(box.SelText(), "1234567");
-    box.setSelStart(50);
-    EXPECT_EQ(std::make_pair(box.SelStart(), box.SelLength()), std::make_pair(10, 0));
-    EXPECT_THROW(box.setSelStart(-1), Error);
-    EXPECT_THROW(box.setSelLength(-1), Error);
-    box.setSelStart(0);
-    box.setSelLength(2);
-    box.setText("new");
-    EXPECT_EQ(std::make_pair(box.SelLength(), box.SelText()), std::make_pair(0, std::string()));
 }
 
 } // namespace

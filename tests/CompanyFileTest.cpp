@@ -57,14 +57,5 @@ TEST(CompanyFileTest, AFailedReadKeepsWhatTheRecordHad) {
     EXPECT_EQ(record.bytes, kept);
 }
 
-TEST(CompanyFileTest, SetTitleFillsTheTitleFieldAndNothingElse) {
-    CompanyRecord record;
-    std::string expected(kAdfRecordLength, '\0');
-    record.setTitle("Short");
-    EXPECT_EQ(record.bytes, expected.replace(20, 60, "Short" + std::string(55, ' ')));
-    record.setTitle(std::string(70, 'x'));
-    EXPECT_EQ(record.bytes, expected.replace(20, 60, std::string(60, 'x')));
-}
-
 } // namespace
 } // namespace dovrel

@@ -108,11 +108,7 @@ TEST(CurrencyNamesTest, FixedCodesCompanyCodesAndCodesWithoutNames) {
     EXPECT_EQ(CurrencyNames(12, company), word);
     EXPECT_EQ(CurrencyNames(10, company), Pair("USD ", "USD "));
     EXPECT_EQ(CurrencyNames(18, company), Pair("18", "18"));
-    EXPECT_EQ(CurrencyNames(1, company), Pair("$", "$"));
-    EXPECT_EQ(CurrencyNames(2, company), Pair(W("לש"), "\xA3"));
-    EXPECT_EQ(CurrencyNames(9, company), Pair(W("ין"), "JY"));
-    EXPECT_EQ(CurrencyNames(19, company), Pair(W("מ"), W("מ")));
-    EXPECT_EQ(CurrencyNames(21, company), Pair(W("ש"), "NIS"));
+    EXPECT_EQ(CurrencyNames(21, company), Pair(W("ש"), "NIS")); // a fixed code
     for (int16_t code : {0, 22, -1, INT16_MAX, INT16_MIN})
         EXPECT_EQ(CurrencyNames(code, company), Pair()) << code;
     EXPECT_EQ(CurrencyNames(13, company).first, std::string("\0A ", 3));
