@@ -4,6 +4,9 @@
 
 #include <gtest/gtest.h>
 
+#include <tuple>
+#include <utility>
+
 namespace dovrel {
 namespace {
 
@@ -12,23 +15,12 @@ ViewerOptions Parse(QStringList arguments) {
     return ViewerOptions::Parse(arguments);
 }
 
-TEST(ViewerOptionsTest, ReadsTheCompanyTheTypeAndTheStart) {
-    ViewerOptions none = Parse({});
-    EXPECT_TRUE(none.compDir.isEmpty());
-    EXPECT_EQ(none.type, 20);
-    EXPECT_EQ(none.start, 2);
-    EXPECT_FALSE(none.help);
-
-    ViewerOptions all = Parse({"/data/comp02", "--type", "30", "--start=7"});
-    EXPECT_EQ(all.compDir, "/data/comp02");
-    EXPECT_EQ(all.type, 30);
-    EXPECT_EQ(all.start, 7);
-    EXPECT_TRUE(Parse({"--help"}).help);
-    EXPECT_EQ(Parse({"--type", "-32768"}).type, -32768);
-    EXPECT_NE(ViewerOptions::HelpText().indexOf("--start <N>"), -1);
-}
-
-TEST(ViewerOptionsTest, RefusesWhatItCannotUse) {
+// The values the viewer is started with, held to the ranges of the control's arguments.
+TEST(ViewerOptionsTest, ReadsTheCompanyTheTypeAndTheStartOrRefusesThem) {
+    ViewerOptions all = Parse({"/data/comp02", "--type", "-32768", "--start=7"});
+    EXPECT_EQ(std::tuple(all.compDir.toStdString(), all.type, all.start),
+              std::tuple("/data/comp02", -32768, 7));
+    EXPECT_EQ(std::pair(Parse({}).type, Parse({}).start), std::pair(20, 2));
     for (QStringList wrong : {QStringList{"a", "b"},
                               {"--start", "0"},
                               {"--start", "x"},
