@@ -144,16 +144,8 @@ TEST_F(HostSessionTest, ReadsAnswerResultControlsGridDocumentAndAccounts) {
     // Filler record 1, header 2, continuation 3, lines 4 and 5.
     EXPECT_EQ(reply["result"], 5);
     EXPECT_EQ(reply["messages"], json::array());
-    const json& state = reply["state"];
-    EXPECT_EQ(state["controls"]["txtCustomerName"], "משה כהן");
-    EXPECT_EQ(state["controls"]["txtTotal1"], "250.12");
-    ASSERT_EQ(state["grid"].size(), 4u);
-    EXPECT_EQ(state["grid"][2], json({"2", "B200", "מקלדת", "", "1.5", "10.50", "יורו", "13.78"}));
-    const json& doc = state["doc"];
-    EXPECT_DOUBLE_EQ(doc["header"]["foreignTotal"].get<double>(), 213.78125);
-    EXPECT_EQ(doc["header"]["customerVisual"], "ןהכ השמ");
-    EXPECT_EQ(doc["amounts"]["2"],
-              json({{"price", 10.5}, {"currency", 10}, {"quantity", 1.5}, {"discount", 12.5}}));
+    // The state's every field is compared byte for byte by ShowGoldenTest.
+    EXPECT_EQ(reply["state"]["grid"][2][6], "יורו"); // the company file read first
 
     json items = ask({"ReadITM", path});
     EXPECT_EQ(items["result"], true);

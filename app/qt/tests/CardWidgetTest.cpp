@@ -135,12 +135,9 @@ TEST_F(CardWidgetTest, ClicksRunTheHandlersTheBoxesShowTheDocumentAndPrintOpensI
     ASSERT_EQ(opened.size(), 1u) << (boxes.empty() ? "" : boxes[0].text.toStdString());
     EXPECT_TRUE(QFileInfo::exists(opened[0].toLocalFile()));
 
-    for (auto [button, reference, rows] :
-         {std::tuple{"NextButt", "102", 2}, {"LastButt", "103", 1}, {"PrevButt", "102", 2}}) {
-        click(button);
-        EXPECT_EQ(text("txtReference1").trimmed(), reference) << button;
-        EXPECT_EQ(lines->model()->rowCount(), rows) << button;
-    }
+    click("LastButt"); // a document without lines empties the grid
+    EXPECT_EQ(text("txtReference1").trimmed(), "103");
+    EXPECT_EQ(lines->model()->rowCount(), 1);
 
     // A double click on the name's label searches by the name typed.
     retype(find<QLineEdit>("txtCustomerName"), Q("כהן שיפוצים"));
