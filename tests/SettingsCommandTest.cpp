@@ -43,12 +43,10 @@ TEST_F(SettingsCommandTest, SetGetListAndUnsetEachApplicationApart) {
         {{"--app", "Dovrel8", "get", "CompPath"},
          {3, "", "No setting \"CompPath\" under Dovrel8\n"}},
         {{"set", "Title", "חשבונית מס"}, {0, "", ""}},
-        {{"set", "COMPPATH", "d:\\חברה"}, {0, "", ""}},
-        {{"get", "comppath"}, {0, "d:\\חברה\n", ""}},
-        {{"list"}, {0, "CompPath=d:\\חברה\nTitle=חשבונית מס\n", ""}},
+        {{"get", "title"}, {0, "חשבונית מס\n", ""}},
         {{"unset", "title"}, {0, "", ""}},
         {{"unset", "Title"}, {3, "", "No setting \"Title\" under Dovrel\n"}},
-        {{"list"}, {0, "CompPath=d:\\חברה\n", ""}},
+        {{"list"}, {0, "CompPath=c:\\comp02\n", ""}},
     };
     for (const auto& [args, expected] : steps)
         EXPECT_EQ(run(args), expected) << ::testing::PrintToString(args);
