@@ -161,10 +161,13 @@ private:
     void search(const char* by, const std::string& value);
     void clearSearch();
     void resetPosition();
+    void readingOrderSetting(uint8_t Action);
     void prepareShow(const std::string& pCompPath, int16_t pWizFile, int32_t pStartPosition);
     Form& form(const std::string& name);
     PageSettings preparePage();
     PageView pageView(std::string title);
+    // What a header box gives the pages (see pageView).
+    std::string pageText(TextBox DocumentView::*box) const;
 
     std::unique_ptr<OwnServices> own_;
     CardServices services_;
@@ -172,6 +175,7 @@ private:
     std::vector<std::unique_ptr<Control>> plain_; // labels, buttons, frames
     std::vector<Control*> controls_;
     PageFile* openPage_ = nullptr; // the page being built, for WriteCell
+    Grid pageLines_{"DocLines"};   // the lines for the pages while the screen reads in order
     Connection compPathChanged_;
 };
 

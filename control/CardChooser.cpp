@@ -24,6 +24,10 @@ void Card::CmdDir_Click() {
 // Every failing step is skipped.
 void Card::cmdAccount_Click() {
     std::string key(Trim(txtAccountKey.Text()));
+    // The accounts file is matched by the key as the control converts it,
+    // also while the box shows the key in reading order.
+    if (ReadingOrder() != 0 && document() && key == document()->accountKey.reading)
+        key = document()->accountKey.logical;
     if (key.empty())
         return;
     AccountsTable& accounts = shared_.Accounts;

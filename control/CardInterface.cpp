@@ -119,6 +119,9 @@ std::map<std::string, Call> MakeCalls() {
         return Variant();
     };
     calls["RulesValue"] = [](Card& c, const Args&) { return Variant(c.RulesValue()); };
+    calls["ReadingOrder"] =
+        Property([](Card& c) { return Number(c.ReadingOrder()); },
+                 [](Card& c, const Variant& v) { c.setReadingOrder(v.toInt16()); });
     return calls;
 }
 
@@ -179,6 +182,8 @@ const std::vector<CardInterface::Member>& CardInterface::Members() {
          Type::None,
          {{"MyNum", Type::Int16, true}, {"CellValue", Type::Text, true}}},
         {"RulesValue", false, Type::Text, {}},
+        // Added after the original members: the screen's reading order.
+        {"ReadingOrder", true, Type::Int16, {}},
     };
     return members;
 }

@@ -42,14 +42,20 @@ PageSettings Card::preparePage() {
     return {shared_.LogoFile, shared_.CompTitle, shared_.PicPath, shared_.PicX, shared_.PicY};
 }
 
+// The pages are made from the texts as the control converts them: while the
+// screen shows reading order, a box that still shows the document's text and
+// the grid give the document's LogicalText instead.
 PageView Card::pageView(std::string title) {
-    PageView view(DocLines);
+    bool reading = ReadingOrder() != 0 && document();
+    if (reading)
+        FillLines(pageLines_, &*document());
+    PageView view(reading ? pageLines_ : DocLines);
     view.title = std::move(title);
-    view.reference = txtReference1.Text();
+    view.reference = pageText(&DocumentView::txtReference1);
     view.date = txtDate.Text();
-    view.customer = txtCustomerName.Text();
-    view.address1 = txtAddress1.Text();
-    view.address2 = txtAddress2.Text();
+    view.customer = pageText(&DocumentView::txtCustomerName);
+    view.address1 = pageText(&DocumentView::txtAddress1);
+    view.address2 = pageText(&DocumentView::txtAddress2);
     view.totalVat = txtTotalVat.Text();
     view.vatValue = txtVatValue.Text();
     view.total1 = txtTotal1.Text();
@@ -59,6 +65,18 @@ PageView Card::pageView(std::string title) {
     view.details = ChkShowDetails.Value() == 1;
     view.showTotalFC = ChkShowTotalFC.Value() == 1;
     return view;
+}
+
+std::string Card::pageText(TextBox DocumentView::*box) const {
+    const std::string& shown = (this->*box).Text();
+    if (ReadingOrder() == 0 || !document())
+        return shown;
+    std::vector<BoxText> reading = HeaderTexts(&*document(), true);
+    std::vector<BoxText> logical = HeaderTexts(&*document(), false);
+    for (size_t i = 0; i < reading.size(); ++i)
+        if (reading[i].first == box && reading[i].second == shown)
+            return logical[i].second;
+    return shown;
 }
 
 void Card::CreateHTML(std::string& pFileName, int16_t& pDocFormat) {
@@ -130,7 +148,14 @@ bool Card::WritePage(const Path& path) {
 // Writes the page into this user's print file and opens it in the browser.
 // With no language chosen nothing is written and nothing opened. A failure
 // is shown as a message and opens nothing.
+// With no document shown (none read yet, or the last walk found nothing) the
+// boxes hold only what an earlier document left; no page is made of that.
 void Card::PrintButt_Click() {
+    if (!document()) {
+        services_.messages.show(MsgIcon::Information, MsgButtons::Ok, FromUtf8("הודעה"),
+                                FromUtf8("אין מסמך להדפסה"));
+        return;
+    }
     try {
         Path path = PrintFilePath();
         if (WritePage(path))

@@ -2,6 +2,9 @@
 #include "control/Card.h"
 
 #include "platform/SettingsBinding.h"
+#include "platform/SettingsStore.h"
+
+#include <string>
 
 namespace dovrel {
 
@@ -40,6 +43,19 @@ void Card::SetGetRegParams(uint8_t& Action) {
     for (const Row& row : rows)
         SetGetRegParam(Action, shared_.AppName, "Params", row.key, row.control, row.kind,
                        row.defaultValue);
+    readingOrderSetting(Action);
+}
+
+// The screen's reading order is kept after the eleven, under its own name.
+void Card::readingOrderSetting(uint8_t Action) {
+    if (Action == 1) {
+        services_.settings.SaveSetting(shared_.AppName, "Params", "ReadingOrder",
+                                       std::to_string(ReadingOrder()));
+    } else if (Action == 2) {
+        Variant stored(services_.settings.GetSetting(shared_.AppName, "Params", "ReadingOrder",
+                                                     std::to_string(ReadingOrder())));
+        setReadingOrder(stored.toInt16());
+    }
 }
 
 } // namespace dovrel

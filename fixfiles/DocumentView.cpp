@@ -3,6 +3,7 @@
 #include "fixfiles/Formats.h"
 #include "fixfiles/TextDecoding.h"
 #include "platform/Encoding.h"
+#include "platform/Error.h"
 #include "platform/Variant.h"
 
 #include <algorithm>
@@ -22,14 +23,15 @@ const std::string& DocLinesFormat() {
 
 // A line's row of the grid: its eight cells joined by TAB. A text-only line
 // shows only its number and description.
-std::string RowText(const Document::Line& line) {
+std::string RowText(const Document::Line& line, bool reading) {
+    auto text = [reading](const DocumentText& t) { return reading ? t.reading : t.logical; };
     const char tab = '\t';
     std::string number = std::to_string(line.lineNumber);
     if (line.textOnly)
-        return number + tab + tab + line.description.logical + std::string(5, tab);
-    return number + tab + line.itemKey.logical + tab + line.description.logical + tab +
-           line.details.logical + tab + PlainNumber(line.quantity) + tab +
-           FormatAmount(line.price) + tab + line.currencyName + tab + FormatAmount(line.total);
+        return number + tab + tab + text(line.description) + std::string(5, tab);
+    return number + tab + text(line.itemKey) + tab + text(line.description) + tab +
+           text(line.details) + tab + PlainNumber(line.quantity) + tab + FormatAmount(line.price) +
+           tab + line.currencyName + tab + FormatAmount(line.total);
 }
 
 } // namespace
@@ -50,16 +52,17 @@ void DocumentView::InitLines(Grid& grid) {
         grid.setColAlignment(col, 7);
 }
 
-void DocumentView::FillLines(Grid& grid, const Document* document) {
+void DocumentView::FillLines(Grid& grid, const Document* document, bool reading) {
     InitLines(grid);
     if (document == nullptr)
         return;
     int32_t row = 0;
     for (const Document::Line& line : document->lines)
-        grid.AddItem(RowText(line), ++row);
+        grid.AddItem(RowText(line, reading), ++row);
 }
 
-std::vector<DocumentView::BoxText> DocumentView::HeaderTexts(const Document* document) {
+std::vector<DocumentView::BoxText> DocumentView::HeaderTexts(const Document* document,
+                                                             bool reading) {
     std::vector<BoxText> texts = {
         {&DocumentView::txtAccountKey, {}},   {&DocumentView::txtReference1, {}},
         {&DocumentView::txtCustomerName, {}}, {&DocumentView::txtDate, {}},
@@ -69,12 +72,13 @@ std::vector<DocumentView::BoxText> DocumentView::HeaderTexts(const Document* doc
     if (document == nullptr)
         return texts;
     const Document& d = *document;
-    std::string values[] = {d.accountKey.logical,
-                            d.reference.logical,
-                            d.customer.logical,
+    auto text = [reading](const DocumentText& t) { return reading ? t.reading : t.logical; };
+    std::string values[] = {text(d.accountKey),
+                            text(d.reference),
+                            text(d.customer),
                             FormatDate(d.date),
-                            d.address1.logical,
-                            d.address2.logical,
+                            text(d.address1),
+                            text(d.address2),
                             FormatAmount(d.totals.beforeVat),
                             FormatAmount(d.totals.vat),
                             FormatAmount(d.totals.withVat)};
@@ -84,12 +88,17 @@ std::vector<DocumentView::BoxText> DocumentView::HeaderTexts(const Document* doc
 }
 
 void DocumentView::showDocument(Document document) {
+    present(document);
+    document_ = std::move(document);
+    documentShown();
+}
+
+void DocumentView::present(const Document& document) {
     // Everything is worked out before the first control changes.
-    std::vector<BoxText> texts = HeaderTexts(&document);
-    FillLines(DocLines, &document);
+    std::vector<BoxText> texts = HeaderTexts(&document, readingOrder_ != 0);
+    FillLines(DocLines, &document, readingOrder_ != 0);
     for (auto& [box, text] : texts)
         (this->*box).setText(std::move(text));
-    document_ = std::move(document);
 }
 
 void DocumentView::showNothing() {
@@ -97,6 +106,17 @@ void DocumentView::showNothing() {
         (this->*box).setText(std::move(text));
     InitDocLines();
     document_.reset();
+    documentShown();
+}
+
+void DocumentView::setReadingOrder(int16_t value) {
+    if (value != 0 && value != 1)
+        throw Error("ReadingOrder takes 0 or 1, not " + std::to_string(value));
+    if (value == readingOrder_)
+        return;
+    readingOrder_ = value;
+    if (document_)
+        present(*document_);
 }
 
 void DocumentView::takeCategoryCodes(const CurrentDocument& current) {

@@ -3,6 +3,7 @@
 #include "fixfiles/Document.h"
 #include "platform/Controls.h"
 #include "platform/Grid.h"
+#include "platform/Signal.h"
 #include "platform/Variant.h"
 
 #include <cstdint>
@@ -32,6 +33,21 @@ public:
     void showDocument(Document document);
     // Shows that nothing was found: empty boxes and grid, no document.
     void showNothing();
+    // Told after every document shown and every walk that found nothing, so
+    // a host can say what the last step did from document().
+    Signal<> documentShown;
+
+    // 0, the default: the boxes, the grid and the searches use the texts as
+    // the control converts them (LogicalText). 1: they use the reading-order
+    // texts, so what is shown reads as typed and can be searched for as
+    // shown. Keys matched against other files keep LogicalText either way.
+    // Anything but 0 or 1 is an Error; a change shows the document again.
+    int16_t ReadingOrder() const { return readingOrder_; }
+    void setReadingOrder(int16_t value);
+    // The text of a field as the boxes and the grid show it.
+    const std::string& shownText(const DocumentText& text) const {
+        return readingOrder_ != 0 ? text.reading : text.logical;
+    }
     // The last document shown; none before the first and after a walk that
     // found nothing.
     const std::optional<Document>& document() const { return document_; }
@@ -40,10 +56,11 @@ public:
     void takeCategoryCodes(const CurrentDocument& current);
 
     using BoxText = std::pair<TextBox DocumentView::*, std::string>;
-    // The header boxes with the texts a document (or none) puts into them.
-    static std::vector<BoxText> HeaderTexts(const Document* document);
+    // The header boxes with the texts a document (or none) puts into them,
+    // in reading order when asked.
+    static std::vector<BoxText> HeaderTexts(const Document* document, bool reading = false);
     // Fills a lines grid as the control shows a document (or none).
-    static void FillLines(Grid& grid, const Document* document);
+    static void FillLines(Grid& grid, const Document* document, bool reading = false);
 
     int32_t PubACTLocation = 2;
     int32_t PubPrevLocation = 0;
@@ -71,7 +88,10 @@ public:
 private:
     static void InitLines(Grid& grid);
 
+    void present(const Document& document);
+
     std::optional<Document> document_;
+    int16_t readingOrder_ = 0;
 };
 
 } // namespace dovrel

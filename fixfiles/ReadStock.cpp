@@ -45,6 +45,17 @@ SearchBy ParseSearchBy(const std::string& name) {
     return SearchBy::None;
 }
 
+// The characters a prefilter may insist on. Reading order mirrors brackets,
+// so a bracket of the text may come from its twin in the field: brackets are
+// left to the comparison itself.
+std::string PrefilterText(std::string text, bool reading) {
+    if (reading)
+        for (char& c : text)
+            if (std::string_view("()[]{}<>").find(c) != std::string_view::npos)
+                c = ' ';
+    return text;
+}
+
 struct Walk {
     int64_t first = 0;
     int64_t last = 0;
@@ -88,6 +99,7 @@ private:
     void accept(const Record& header, const Record& cont, const Date& date);
     const std::string& searchText();
     const FieldPrefilter& filterFor(std::optional<FieldPrefilter>& filter, const std::string& text);
+    bool reading() const { return view_.ReadingOrder() != 0; }
 
     DocumentView& view_;
     const StockContext& ctx_;
@@ -119,7 +131,7 @@ const std::string& StockScan::searchText() {
 const FieldPrefilter& StockScan::filterFor(std::optional<FieldPrefilter>& filter,
                                            const std::string& text) {
     if (!filter)
-        filter.emplace(text);
+        filter.emplace(PrefilterText(text, reading()));
     return *filter;
 }
 
@@ -144,8 +156,13 @@ bool IsHiddenLine(const unsigned char* rec) {
     return hash;
 }
 
-std::string AccountKeyOf(const unsigned char* header) {
-    return TrimCopy(LogicalText(Field(header, 2, 8)));
+// The text a search compares: as the control shows the field, trimmed.
+std::string SearchedText(std::string_view field, bool reading) {
+    return reading ? ReadingOrderText(field) : TrimCopy(LogicalText(field));
+}
+
+std::string AccountKeyOf(const unsigned char* header, bool reading = false) {
+    return SearchedText(Field(header, 2, 8), reading);
 }
 
 // A text field as stored (trimmed), as the control shows it and as people
@@ -313,19 +330,22 @@ bool StockScan::passesHeader(const unsigned char* h, bool& matched) {
     case SearchBy::None:
         return true;
     case SearchBy::AccountKey:
-        return EqualsNoCase(AccountKeyOf(h), searchText());
-    case SearchBy::Reference1:
-        return EqualsNoCase(Trim(Field(h, 100, 5)), searchText());
+        return EqualsNoCase(AccountKeyOf(h, reading()), searchText());
+    case SearchBy::Reference1: {
+        std::string_view stored = Field(h, 100, 5);
+        return EqualsNoCase(reading() ? ReadingOrderText(stored) : std::string(Trim(stored)),
+                            searchText());
+    }
     case SearchBy::CustomerName: {
         std::string_view stored = Field(h, 10, 30);
         return filterFor(headerFilter_, searchText()).mayContain(stored) &&
-               ContainsNoCase(TrimCopy(LogicalText(stored)), searchText());
+               ContainsNoCase(SearchedText(stored, reading()), searchText());
     }
     case SearchBy::ItemKey:
     case SearchBy::Details:
         matched = false;
         return view_.txtAccountKey.Text().empty() ||
-               EqualsNoCase(view_.txtAccountKey.Text(), AccountKeyOf(h));
+               EqualsNoCase(view_.txtAccountKey.Text(), AccountKeyOf(h, reading()));
     }
     return true;
 }
@@ -336,13 +356,13 @@ bool StockScan::lineMatches(const unsigned char* rec) {
         std::string_view stored = Field(rec, 1, 12);
         const std::string& wanted = view_.txtItemKey.Text();
         return filterFor(lineFilter_, wanted).mayEqual(stored) &&
-               EqualsNoCase(TrimCopy(LogicalText(stored)), wanted);
+               EqualsNoCase(SearchedText(stored, reading()), wanted);
     }
     if (searchBy_ == SearchBy::Details) {
         std::string_view stored = Trim(Field(rec, 64, 8));
         const std::string& wanted = view_.txtDetails.Text();
         return filterFor(lineFilter_, wanted).mayContain(stored) &&
-               ContainsNoCase(TrimCopy(LogicalText(stored)), wanted);
+               ContainsNoCase(SearchedText(stored, reading()), wanted);
     }
     return false;
 }

@@ -34,6 +34,8 @@ bool CardMembers::SetPub(Card& card, const std::string& name, const nlohmann::js
         card.PubSearchBy = HostArgs::Text(value, name);
     else if (name == "PubSearchValue")
         card.PubSearchValue = HostArgs::Scalar(value, name);
+    else if (name == "ReadingOrder")
+        card.setReadingOrder(static_cast<int16_t>(HostArgs::Integer(value, name, 0, 1)));
     else
         return false;
     return true;
@@ -111,6 +113,8 @@ nlohmann::json CardMembers::Get(Card& card, const std::string& name) {
         return StateJson::Text(card.PubSearchBy);
     if (name == "PubSearchValue")
         return StateJson::FromVariant(card.PubSearchValue);
+    if (name == "ReadingOrder")
+        return card.ReadingOrder();
     return StateJson::ControlValue(Find(card, name));
 }
 

@@ -10,7 +10,7 @@
 namespace dovrel {
 
 // Reads and writes a Card's public members and child controls by name, with
-// JSON values: the four Pub members, the text of a text box, the position of
+// JSON values: the four Pub members and ReadingOrder, the text of a text box, the position of
 // a list (-1 for none), the value of a check box, the path of a directory
 // tree. Getting also gives a shape's width, a grid's cells, a caption, and a
 // side form's list with its entries. "FORM.CONTROL" names a
