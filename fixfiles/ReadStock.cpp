@@ -95,7 +95,8 @@ private:
     Candidate tryDocument(RecordFile& file, const unsigned char* headerRec, int64_t at);
     bool passesHeader(const unsigned char* h, bool& matched);
     bool lineMatches(const unsigned char* rec);
-    void processLine(const unsigned char* rec, uint8_t docType, bool& matched);
+    bool anyLineMatches(RecordFile& file, int64_t cont, int lineRecords, uint8_t docType);
+    void processLine(const unsigned char* rec, uint8_t docType);
     void accept(const Record& header, const Record& cont, const Date& date);
     const std::string& searchText();
     const FieldPrefilter& filterFor(std::optional<FieldPrefilter>& filter, const std::string& text);
@@ -308,6 +309,10 @@ StockScan::Candidate StockScan::tryDocument(RecordFile& file, const unsigned cha
     if (fromDate_ && DateOf(cont) < *fromDate_)
         return {false, at + 1};
 
+    // A line search looks for its line first; the document it finds is then
+    // shown whole, from its first line.
+    if (!matched && !anyLineMatches(file, at + 1, lineRecords, header[1]))
+        return {false, at + 1 + lineRecords};
     lines_.clear();
     factor_ = (100 - DoubleAt(cont.data(), 112)) / 100;
     accepted_ = 0;
@@ -316,10 +321,8 @@ StockScan::Candidate StockScan::tryDocument(RecordFile& file, const unsigned cha
     for (int i = 0; i < lineRecords; ++i) {
         // Line records past the end of the file produce nothing.
         if (const unsigned char* rec = file.record(++p))
-            processLine(rec, header[1], matched);
+            processLine(rec, header[1]);
     }
-    if (!matched)
-        return {false, p};
     accept(header, cont, DateOf(cont));
     return {true, p};
 }
@@ -367,12 +370,17 @@ bool StockScan::lineMatches(const unsigned char* rec) {
     return false;
 }
 
-void StockScan::processLine(const unsigned char* rec, uint8_t docType, bool& matched) {
+bool StockScan::anyLineMatches(RecordFile& file, int64_t cont, int lineRecords, uint8_t docType) {
+    for (int64_t p = cont + 1; p <= cont + lineRecords; ++p) {
+        const unsigned char* rec = file.record(p);
+        if (rec != nullptr && rec[93] == docType && !IsHiddenLine(rec) && lineMatches(rec))
+            return true;
+    }
+    return false;
+}
+
+void StockScan::processLine(const unsigned char* rec, uint8_t docType) {
     if (rec[93] != docType || IsHiddenLine(rec))
-        return;
-    if (!matched)
-        matched = lineMatches(rec);
-    if (!matched)
         return;
     if (++accepted_ > kMaxDocLines)
         throw Error("The document has more than " + std::to_string(kMaxDocLines) + " lines");

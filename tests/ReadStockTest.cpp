@@ -257,7 +257,9 @@ TEST_F(ReadStockTest, SearchesByHeaderFieldsAndFromDate) {
     EXPECT_EQ(U(messages.shown().back().title), "שגיאה");
 }
 
-TEST_F(ReadStockTest, ItemKeyAndDetailsSearchesStartTheGridAtTheFirstMatch) {
+// A document found by one of its lines is shown whole: a grid that started at
+// the matching line hid the lines before it and printed them nowhere.
+TEST_F(ReadStockTest, ItemKeyAndDetailsSearchesShowTheWholeDocumentFound) {
     json b = Doc(
         20, "2", "ב",
         {Line("K1", "one"), {{"key", "K3"}, {"details", "RED"}, {"price", 5}}, Line("K4", "four")});
@@ -266,11 +268,11 @@ TEST_F(ReadStockTest, ItemKeyAndDetailsSearchesStartTheGridAtTheFirstMatch) {
 
     EXPECT_GT(readLines("ItemKey", "k2", ""), 0);
     EXPECT_EQ(box(card->txtReference1), "1");
-    ASSERT_EQ(card->DocLines.Rows(), 3);
-    EXPECT_EQ(gridRow(1)[0] + gridRow(1)[1], "2K2");
-    EXPECT_EQ(state.Doc.lineCount, 1);
-    EXPECT_EQ(state.Doc.lines[1].itemKey, "K2          ");
-    EXPECT_TRUE(state.Doc.amounts[1].isZero()); // line 1 came before the match
+    ASSERT_EQ(card->DocLines.Rows(), 4);
+    EXPECT_EQ(gridRow(1)[0] + gridRow(1)[1] + gridRow(2)[0] + gridRow(2)[1], "1K12K2");
+    EXPECT_EQ(state.Doc.lineCount, 2);
+    EXPECT_EQ(state.Doc.lines[1].itemKey, "K1          ");
+    EXPECT_FALSE(state.Doc.amounts[1].isZero());
     EXPECT_FALSE(state.Doc.amounts[2].isZero());
 
     // The account box narrows an item search to that account.
@@ -279,7 +281,7 @@ TEST_F(ReadStockTest, ItemKeyAndDetailsSearchesStartTheGridAtTheFirstMatch) {
     EXPECT_EQ(card->DocLines.Rows(), 5);
 
     readLines("Details", "re", "");
-    EXPECT_EQ(box(card->txtReference1) + cell(1, 1) + cell(2, 1), "2K3K4");
+    EXPECT_EQ(box(card->txtReference1) + cell(1, 1) + cell(2, 1), "2K1K3");
 
     // Backward, a document without a match is passed over once, not forever (the account box
     // is emptied: the document shown filled it in).
