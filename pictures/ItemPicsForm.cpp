@@ -170,6 +170,7 @@ void ItemPicsForm::SetGetMoreParams(uint8_t Action) {
 bool ItemPicsForm::CheckDBFile() {
     if (FileExists(PathFromCp1255(settingDbName())))
         return true;
+    databaseMissing(settingDbName());
     messages().show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("שגיאה"),
                     FromUtf8("קובץ ההגדרות אינו נמצא"));
     return false;

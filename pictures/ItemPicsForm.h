@@ -45,6 +45,9 @@ public:
     void SetGetMoreParams(uint8_t Action);
     // True when the database file exists at the DBPath setting; otherwise says so.
     bool CheckDBFile();
+    // Told the full name (code page 1255) of a database that CheckDBFile did
+    // not find, before its message, so a host can say where it looked.
+    Signal<std::string> databaseMissing;
 
     void CmdDelete_Click();
     void CmdNew_Click();

@@ -50,6 +50,11 @@ QSize CardWidget::sizeHint() const {
                  ControlBinder::ToPixels(kCardDesignHeight, scale));
 }
 
+void CardWidget::resizeEvent(QResizeEvent* event) {
+    QWidget::resizeEvent(event);
+    binder_->arrange(sizeHint(), size(), "DocLines");
+}
+
 void CardWidget::bindSurface() {
     SurfaceEvents events;
     events.click = [this](const std::string& name) { card_->Click(name); };
@@ -68,6 +73,7 @@ void CardWidget::bindSurface() {
         }
         binder_->bind(*control, design);
     }
+    setMinimumSize(sizeHint());
     resize(sizeHint());
 }
 

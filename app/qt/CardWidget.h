@@ -46,7 +46,14 @@ public:
     // sans font with Hebrew letters.
     static QFont SurfaceFont();
 
+    // The design's size, scaled to the screen: the comfortable minimum. A
+    // larger widget is laid out anchored to the right, the grid taking the
+    // extra width and height.
     QSize sizeHint() const override;
+    QSize minimumSizeHint() const override { return sizeHint(); }
+
+protected:
+    void resizeEvent(QResizeEvent* event) override;
 
 private:
     void bindSurface();

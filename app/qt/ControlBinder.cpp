@@ -1,6 +1,7 @@
 #include "app/qt/ControlBinder.h"
 
 #include "app/qt/GridModel.h"
+#include "app/qt/GridView.h"
 #include "app/qt/QtText.h"
 #include "platform/FileSystem.h"
 #include "platform/ListControls.h"
@@ -71,12 +72,45 @@ int ControlBinder::ToPixels(int32_t twips, double scale) {
 void ControlBinder::place(QWidget* widget, const ControlDesign& design) {
     widget->setParent(surface_);
     widget->setObjectName(QString::fromStdString(design.name));
-    widget->setGeometry(ToPixels(design.left, scale_), ToPixels(design.top, scale_),
-                        ToPixels(design.width, scale_), ToPixels(design.height, scale_));
+    widget->setGeometry(designRect(design, widget));
+    designs_[widget] = design;
     if (!design.toolTip.empty())
         widget->setToolTip(ToQString(design.toolTip));
     widgets_[design.name] = widget;
     names_[widget] = design.name;
+}
+
+// A label is made tall enough for its font, which may be taller than the
+// design's where its font is missing.
+QRect ControlBinder::designRect(const ControlDesign& design, const QWidget* widget) const {
+    QRect rect(ToPixels(design.left, scale_), ToPixels(design.top, scale_),
+               ToPixels(design.width, scale_), ToPixels(design.height, scale_));
+    if (qobject_cast<const QLabel*>(widget) != nullptr)
+        rect.setHeight(std::max(rect.height(), widget->fontMetrics().height() + 2));
+    return rect;
+}
+
+void ControlBinder::arrange(QSize designSize, QSize size, const std::string& stretching) {
+    int dx = std::max(0, size.width() - designSize.width());
+    int dy = std::max(0, size.height() - designSize.height());
+    QWidget* grid = widgetFor(stretching);
+    QRect anchor = grid != nullptr ? designRect(designs_.at(grid), grid) : QRect();
+    for (const auto& [widget, design] : designs_) {
+        QRect rect = designRect(design, widget);
+        bool spansWidth =
+            grid != nullptr && rect.left() <= anchor.left() && rect.right() >= anchor.right();
+        bool spansHeight =
+            grid != nullptr && rect.top() <= anchor.top() && rect.bottom() >= anchor.bottom();
+        if (spansWidth)
+            rect.setWidth(rect.width() + dx);
+        else
+            rect.translate(dx, 0);
+        if (spansHeight)
+            rect.setHeight(rect.height() + dy);
+        else if (grid != nullptr && rect.top() > anchor.center().y())
+            rect.translate(0, dy);
+        widget->setGeometry(rect);
+    }
 }
 
 QWidget* ControlBinder::bind(Control& control, const ControlDesign& design, bool editableGrid) {
@@ -150,6 +184,7 @@ void ControlBinder::follow(Signal<>& changed, std::function<void()> refresher) {
 
 QWidget* ControlBinder::makeTextBox(TextBox& box, const ControlDesign& design) {
     auto* edit = new QLineEdit(surface_);
+    edit->setAlignment(Qt::AlignRight | Qt::AlignAbsolute | Qt::AlignVCenter);
     if (design.grey) {
         QPalette palette = edit->palette();
         palette.setColor(QPalette::Base, palette.color(QPalette::Button));
@@ -160,8 +195,14 @@ QWidget* ControlBinder::makeTextBox(TextBox& box, const ControlDesign& design) {
         ++syncing_;
         if (edit->text() != text)
             edit->setText(text);
-        if (box.SelLength() > 0 && (edit->selectionStart() != box.SelStart() ||
-                                    edit->selectedText().size() != box.SelLength()))
+        // A number reads left to right, its minus sign first, in a box that
+        // stays aligned to the right.
+        edit->setLayoutDirection(IsPlainNumber(text) ? Qt::LeftToRight : Qt::RightToLeft);
+        // A box without the focus shows no selection, so only the focused
+        // one stands out.
+        if (edit->hasFocus() && box.SelLength() > 0 &&
+            (edit->selectionStart() != box.SelStart() ||
+             edit->selectedText().size() != box.SelLength()))
             edit->setSelection(box.SelStart(), box.SelLength());
         --syncing_;
     });
@@ -381,7 +422,9 @@ QWidget* ControlBinder::makeShape(const ControlDesign&) {
 
 QWidget* ControlBinder::makeGrid(Control& control, bool editable) {
     auto& grid = static_cast<Grid&>(control);
-    auto* view = new QTableView(surface_);
+    // The lines grid fits its columns to its width; an editable grid keeps
+    // the widths its headings ask for.
+    auto* view = new GridView(!editable, surface_);
     auto* model = new GridModel(grid, editable, view);
     view->setModel(model);
     view->verticalHeader()->hide();
@@ -392,8 +435,10 @@ QWidget* ControlBinder::makeGrid(Control& control, bool editable) {
     view->verticalHeader()->setDefaultSectionSize(view->fontMetrics().height() + 4);
     auto sizeColumns = [view, &grid] {
         int charWidth = view->fontMetrics().averageCharWidth();
+        std::vector<int> widths;
         for (int32_t col = 0; col < grid.Cols(); ++col)
-            view->setColumnWidth(col, std::max(24, (grid.ColWidthChars(col) + 1) * charWidth));
+            widths.push_back(std::max(24, (grid.ColWidthChars(col) + 1) * charWidth));
+        view->setDesignWidths(std::move(widths));
     };
     sizeColumns();
     connect(model, &QAbstractItemModel::modelReset, view, sizeColumns);

@@ -4,6 +4,8 @@
 #include "platform/Controls.h"
 
 #include <QObject>
+#include <QRect>
+#include <QSize>
 
 #include <functional>
 #include <map>
@@ -54,6 +56,12 @@ public:
     // a notice, captions set directly).
     void refresh();
 
+    // Lays the placed widgets out on a surface of the given size, at least
+    // the design's: anchored to the right, the stretching widget (the grid)
+    // taking the extra width and height; what lies below its middle moves
+    // down, what spans it grows with it.
+    void arrange(QSize designSize, QSize size, const std::string& stretching);
+
 protected:
     bool eventFilter(QObject* watched, QEvent* event) override;
 
@@ -71,12 +79,14 @@ private:
     void watch(QWidget* widget, const std::string& name);
     void follow(Signal<>& changed, std::function<void()> refresher);
     void user(const std::function<void()>& step);
+    QRect designRect(const ControlDesign& design, const QWidget* widget) const;
 
     QWidget* surface_;
     SurfaceEvents events_;
     double scale_;
     std::shared_ptr<bool> alive_; // false once the binder is gone
     std::map<std::string, QWidget*> widgets_;
+    std::map<QWidget*, ControlDesign> designs_;
     std::map<const QObject*, std::string> names_;
     std::vector<std::function<void()>> refreshers_;
     std::vector<Connection> connections_; // to the models, dropped with the binder

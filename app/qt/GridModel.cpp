@@ -36,8 +36,10 @@ int GridModel::columnCount(const QModelIndex& parent) const {
 QVariant GridModel::data(const QModelIndex& index, int role) const {
     if (!index.isValid() || index.row() >= rowCount() || index.column() >= columnCount())
         return QVariant();
-    if (role == Qt::DisplayRole || role == Qt::EditRole)
-        return ToQString(grid_.TextMatrix(gridRow(index.row()), index.column()));
+    if (role == Qt::DisplayRole || role == Qt::EditRole) {
+        QString text = ToQString(grid_.TextMatrix(gridRow(index.row()), index.column()));
+        return role == Qt::DisplayRole && IsPlainNumber(text) ? LeftToRight(text) : text;
+    }
     if (role == Qt::TextAlignmentRole)
         return QVariant::fromValue(Alignment(grid_.ColAlignment(index.column())));
     return QVariant();
@@ -46,8 +48,10 @@ QVariant GridModel::data(const QModelIndex& index, int role) const {
 QVariant GridModel::headerData(int section, Qt::Orientation orientation, int role) const {
     if (orientation == Qt::Vertical || section < 0 || section >= columnCount())
         return QVariant();
+    // The spaces after a heading widen its column (ColWidthChars); drawn,
+    // they would push the heading's letters out of sight.
     if (role == Qt::DisplayRole)
-        return headingRows() > 0 ? ToQString(grid_.TextMatrix(0, section)) : QVariant();
+        return headingRows() > 0 ? ToQString(grid_.TextMatrix(0, section)).trimmed() : QVariant();
     if (role == Qt::TextAlignmentRole)
         return QVariant::fromValue(Alignment(grid_.ColAlignment(section)));
     return QVariant();

@@ -30,7 +30,10 @@ void QtBrowser::Open(const Path& path) {
     std::string native = ResolvePath(path).native();
     QString local =
         QFile::decodeName(QByteArray(native.data(), static_cast<qsizetype>(native.size())));
-    QUrl url = QUrl::fromLocalFile(QFileInfo(local).absoluteFilePath());
+    QString file = QFileInfo(local).absoluteFilePath();
+    if (written_)
+        written_(file);
+    QUrl url = QUrl::fromLocalFile(file);
     if (!opener_(url))
         throw Error("The browser could not be started for " + FromQString(url.toString()));
 }

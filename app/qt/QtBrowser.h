@@ -15,13 +15,19 @@ class QtBrowser : public Browser {
 public:
     using Opener = std::function<bool(const QUrl& url)>;
 
+    // Told the full name of each page it is asked to open, before the
+    // browser is started.
+    using Written = std::function<void(const QString& file)>;
+
     QtBrowser();
     void setOpener(Opener opener);
+    void setWritten(Written written) { written_ = std::move(written); }
 
     void Open(const Path& path) override;
 
 private:
     Opener opener_;
+    Written written_;
 };
 
 } // namespace dovrel

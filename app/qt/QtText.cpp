@@ -3,6 +3,8 @@
 #include "platform/Encoding.h"
 #include "platform/Error.h"
 
+#include <QRegularExpression>
+
 namespace dovrel {
 
 QString ToQString(std::string_view cp1255) {
@@ -60,6 +62,15 @@ QVariant ToQVariant(const Variant& value) {
         return value.toBool();
     }
     return QVariant();
+}
+
+bool IsPlainNumber(const QString& text) {
+    static const QRegularExpression number(QStringLiteral("^\\s*-?[0-9][0-9,]*(\\.[0-9]+)?\\s*$"));
+    return number.match(text).hasMatch();
+}
+
+QString LeftToRight(const QString& text) {
+    return QChar(0x200E) + text;
 }
 
 } // namespace dovrel

@@ -15,6 +15,13 @@ namespace dovrel {
 QString ToQString(std::string_view cp1255);
 std::string FromQString(const QString& text);
 
+// Whether a text, spaces aside, is a number as the control writes them
+// ("-1,234.50", "3").
+bool IsPlainNumber(const QString& text);
+// The text with a left-to-right mark before it, so that a number shown in a
+// right-to-left place keeps its minus sign before the digits.
+QString LeftToRight(const QString& text);
+
 // A host's value where the control takes a VARIANT, and back. An invalid
 // QVariant is empty, a null one (std::nullptr_t) is null; strings, numbers and
 // booleans keep their kinds. Other kinds are refused with an Error.

@@ -1,5 +1,6 @@
 // dovrel-viewer [COMPDIR] [--type CODE] [--start N]: the viewer control in a
-// window of its own, started as a container without a page starts it, and
+// window of its own with menus and a status bar, started as a container
+// without a page starts it, with Qt's own texts in Hebrew, and
 // showing the first document of the type at or after the record when a
 // company is given.
 #include "app/qt/CardObject.h"
@@ -9,7 +10,9 @@
 #include "app/qt/QtFormPresenter.h"
 #include "app/qt/QtMessages.h"
 #include "app/qt/QtText.h"
+#include "app/qt/QtTranslations.h"
 #include "app/qt/ViewerOptions.h"
+#include "app/qt/ViewerWindow.h"
 #include "platform/Clock.h"
 #include "platform/Encoding.h"
 #include "platform/Path.h"
@@ -17,7 +20,6 @@
 
 #include <QApplication>
 #include <QFile>
-#include <QMainWindow>
 
 #include <iostream>
 #include <string_view>
@@ -32,7 +34,9 @@ int main(int argc, char* argv[]) {
     }
     QApplication app(argc, argv);
     QApplication::setApplicationName("dovrel-viewer");
+    QApplication::setApplicationVersion(DOVREL_VERSION);
     QApplication::setLayoutDirection(Qt::RightToLeft);
+    dovrel::QtTranslations::LoadHebrew(app);
     dovrel::ViewerOptions options;
     try {
         options = dovrel::ViewerOptions::Parse(QApplication::arguments());
@@ -54,17 +58,15 @@ int main(int argc, char* argv[]) {
     SystemClock clock;
     CardServices services{messages, settings, forms, clipboard, browser, clock};
 
-    QMainWindow window;
     ModuleState state;
-    auto* card = new CardWidget(services, state);
-    window.setCentralWidget(card);
-    window.setWindowTitle(ToQString(FromUtf8("דוברל")));
+    ViewerWindow window(services, state, browser);
+    CardWidget* card = &window.card();
     messages.setParent(&window);
     messages.setInputHold(&card->inputHold());
     forms.setParent(&window);
     forms.setInputHold(&card->inputHold());
     CardObject control(*card);
-    card->runForUser([&] { card->card().UserControl_InitProperties(nullptr); });
+    window.start();
     window.show();
     if (!options.compDir.isEmpty()) {
         // The folder keeps its native name even where code page 1255 lacks letters of it.
