@@ -320,9 +320,15 @@ StockScan::Candidate StockScan::tryDocument(RecordFile& file, const unsigned cha
     int64_t p = at + 1;
     for (int i = 0; i < lineRecords; ++i) {
         // Line records past the end of the file produce nothing.
-        if (const unsigned char* rec = file.record(++p))
+        if (const unsigned char* rec = file.record(++p)) {
+            // Asked again, as a writer may have changed the lines meanwhile.
+            if (!matched)
+                matched = rec[93] == header[1] && !IsHiddenLine(rec) && lineMatches(rec);
             processLine(rec, header[1]);
+        }
     }
+    if (!matched)
+        return {false, p};
     accept(header, cont, DateOf(cont));
     return {true, p};
 }

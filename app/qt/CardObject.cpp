@@ -106,6 +106,14 @@ void CardObject::setPicPath(const QVariant& value) {
     invoke("PicPath", {value});
 }
 
+short CardObject::ReadingOrder() {
+    return static_cast<short>(invoke("ReadingOrder", {}).toInt());
+}
+
+void CardObject::setReadingOrder(short value) {
+    invoke("ReadingOrder", {QVariant::fromValue(value)});
+}
+
 void CardObject::InitCmbDocType() {
     invoke("InitCmbDocType", {});
 }

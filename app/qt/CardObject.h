@@ -26,6 +26,7 @@ class CardObject : public QObject {
     Q_PROPERTY(QVariant CompanyTitle READ CompanyTitle WRITE setCompanyTitle)
     Q_PROPERTY(QVariant DBPath READ DBPath WRITE setDBPath)
     Q_PROPERTY(QVariant PicPath READ PicPath WRITE setPicPath)
+    Q_PROPERTY(short ReadingOrder READ ReadingOrder WRITE setReadingOrder)
     Q_PROPERTY(QString lastError READ lastError)
 
 public:
@@ -55,6 +56,8 @@ public:
     void setDBPath(const QVariant& value);
     QVariant PicPath();
     void setPicPath(const QVariant& value);
+    short ReadingOrder();
+    void setReadingOrder(short value);
 
     Q_INVOKABLE void InitCmbDocType();
     Q_INVOKABLE void InitDocLines();

@@ -31,8 +31,9 @@ QString Q(const char* utf8) {
 
 ViewerWindow::ViewerWindow(const CardServices& services, ModuleState& state, QtBrowser& browser,
                            QWidget* parent)
-    : QMainWindow(parent), services_(services), card_(new CardWidget(services, state)),
-      keys_(new CardKeys(*card_)), scroll_(new QScrollArea(this)) {
+    : QMainWindow(parent), services_(services), browser_(browser),
+      card_(new CardWidget(services, state)), keys_(new CardKeys(*card_)),
+      scroll_(new QScrollArea(this)) {
     setWindowTitle(Q("דוברל"));
     setLayoutDirection(Qt::RightToLeft);
     scroll_->setWidget(card_);
@@ -45,7 +46,9 @@ ViewerWindow::ViewerWindow(const CardServices& services, ModuleState& state, QtB
     browser.setWritten([this](const QString& file) { pageWritten(file); });
 }
 
-ViewerWindow::~ViewerWindow() = default;
+ViewerWindow::~ViewerWindow() {
+    browser_.setWritten(nullptr);
+}
 
 QAction* ViewerWindow::addAction(QMenu* menu, const char* textUtf8, const QKeySequence& key) {
     QAction* action = menu->addAction(Q(textUtf8));

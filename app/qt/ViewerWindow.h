@@ -56,6 +56,7 @@ private:
     void savePlace();
 
     const CardServices& services_;
+    QtBrowser& browser_;
     CardWidget* card_;
     CardKeys* keys_;
     QScrollArea* scroll_;

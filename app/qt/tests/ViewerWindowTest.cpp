@@ -184,6 +184,8 @@ TEST_F(ViewerWindowTest, TextsOnScreenReadAsTheDemoCompanyWasWrittenWhileReading
     EXPECT_EQ(window->card().card().ReadingOrder(), 0);
     EXPECT_EQ(text("txtAddress1"), ToQString(window->card().card().document()->address1.logical));
     EXPECT_NE(text("txtAddress1"), Q("רח' הרצל 45"));
+    object->setProperty("ReadingOrder", 1);
+    EXPECT_EQ(text("txtAddress1"), Q("רח' הרצל 45"));
 }
 
 // The search by details: Enter in the box searches, Page Down steps on, and
