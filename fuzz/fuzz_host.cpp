@@ -4,7 +4,7 @@
 
 #include "FuzzSupport.h"
 
-#include "app/cli/HostSession.h"
+#include "app/session/HostSession.h"
 #include "control/ModuleState.h"
 #include "tools/SampleWriter.h"
 

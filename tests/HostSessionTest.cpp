@@ -1,8 +1,8 @@
-#include "app/cli/HostSession.h"
+#include "app/session/HostSession.h"
 
 #include "TestCompany.h"
-#include "app/cli/CardMembers.h"
-#include "app/cli/StateJson.h"
+#include "app/session/CardMembers.h"
+#include "app/session/StateJson.h"
 #include "platform/Encoding.h"
 #include "platform/Error.h"
 

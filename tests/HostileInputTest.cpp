@@ -3,7 +3,7 @@
 // in every text field.
 
 #include "TestCompany.h"
-#include "app/cli/StateJson.h"
+#include "app/session/StateJson.h"
 #include "control/Card.h"
 #include "platform/Error.h"
 

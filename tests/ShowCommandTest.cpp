@@ -1,7 +1,7 @@
 #include "app/cli/ShowCommand.h"
 
 #include "TestCompany.h"
-#include "app/cli/HostSession.h"
+#include "app/session/HostSession.h"
 #include "platform/Error.h"
 #include "platform/Variant.h"
 

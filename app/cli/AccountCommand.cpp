@@ -2,7 +2,7 @@
 
 #include "app/cli/CompanyDir.h"
 #include "app/cli/ExitCode.h"
-#include "app/cli/StateJson.h"
+#include "app/session/StateJson.h"
 #include "fixfiles/AccountsFile.h"
 #include "fixfiles/TextDecoding.h"
 #include "platform/Encoding.h"

@@ -1,7 +1,7 @@
 #include "app/cli/CompaniesCommand.h"
 
 #include "app/cli/ExitCode.h"
-#include "app/cli/StateJson.h"
+#include "app/session/StateJson.h"
 #include "forms/Companies.h"
 #include "platform/Encoding.h"
 #include "platform/Error.h"

@@ -2,7 +2,7 @@
 
 #include "app/cli/CompanyDir.h"
 #include "app/cli/ExitCode.h"
-#include "app/cli/StateJson.h"
+#include "app/session/StateJson.h"
 #include "fixfiles/DateSerial.h"
 #include "fixfiles/DocTypes.h"
 #include "fixfiles/Formats.h"

@@ -1,9 +1,9 @@
 #include "app/cli/ExitCode.h"
-#include "app/cli/HostSession.h"
 #include "app/cli/PrintCommand.h"
 #include "app/cli/SettingsCommand.h"
 #include "app/cli/ShowCommand.h"
 #include "app/cli/Subcommands.h"
+#include "app/session/HostSession.h"
 #include "platform/TerminalText.h"
 
 #include <CLI/CLI.hpp>

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "app/cli/HostArgs.h"
+#include "app/session/HostArgs.h"
 #include "control/Card.h"
 
 #include <string>

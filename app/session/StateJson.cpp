@@ -1,4 +1,4 @@
-#include "app/cli/StateJson.h"
+#include "app/session/StateJson.h"
 
 #include "platform/Encoding.h"
 #include "platform/ListControls.h"

@@ -1,7 +1,7 @@
-#include "app/cli/CardMembers.h"
+#include "app/session/CardMembers.h"
 
-#include "app/cli/HostArgs.h"
-#include "app/cli/StateJson.h"
+#include "app/session/HostArgs.h"
+#include "app/session/StateJson.h"
 #include "platform/Encoding.h"
 #include "platform/Error.h"
 #include "platform/ListControls.h"

@@ -1,4 +1,4 @@
-#include "app/cli/HostArgs.h"
+#include "app/session/HostArgs.h"
 
 #include "platform/Encoding.h"
 #include "platform/Error.h"

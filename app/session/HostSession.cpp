@@ -1,7 +1,7 @@
-#include "app/cli/HostSession.h"
+#include "app/session/HostSession.h"
 
-#include "app/cli/CardMembers.h"
-#include "app/cli/StateJson.h"
+#include "app/session/CardMembers.h"
+#include "app/session/StateJson.h"
 #include "control/CardInterface.h"
 #include "fixfiles/AccountsFile.h"
 #include "fixfiles/CompanyFile.h"

@@ -1,7 +1,7 @@
 #pragma once
 
-#include "app/cli/HostArgs.h"
-#include "app/cli/HostForms.h"
+#include "app/session/HostArgs.h"
+#include "app/session/HostForms.h"
 #include "control/Card.h"
 #include "control/ModuleState.h"
 #include "platform/Browser.h"

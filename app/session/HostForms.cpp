@@ -1,4 +1,4 @@
-#include "app/cli/HostForms.h"
+#include "app/session/HostForms.h"
 
 #include "platform/Error.h"
 
