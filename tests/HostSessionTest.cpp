@@ -311,6 +311,8 @@ TEST_F(HostSessionTest, PrintingOpensThePageAndFormGridsTakeTyping) {
     // The picture settings form is loaded, hidden, at start-up.
     ask({"set", "frmItemPics.ItemPicLines", 0, 1, "key"});
     EXPECT_EQ(ask({"get", "frmItemPics.ItemPicLines"})["value"][0][1], "key");
+    EXPECT_EQ(ask({"state"})["state"]["forms"]["frmItemPics"]["controls"]["ItemPicLines"][0][1],
+              "key");
     EXPECT_TRUE(ask({"select", "frmItemPics.ItemPicLines", 0})["ok"]);
     EXPECT_FALSE(ask({"select", "frmItemPics.ItemPicLines", 5})["ok"]);
     EXPECT_FALSE(ask({"set", "frmItemPics.ItemPicLines", 0, 9, "x"})["ok"]);

@@ -54,12 +54,20 @@ json StateJson::Controls(const std::vector<Control*>& list) {
     return controls;
 }
 
+// A form's grid is its only one, so its cells go with the other controls.
+json StateJson::FormControls(const std::vector<Control*>& list) {
+    json controls = json::object();
+    for (const Control* control : list)
+        controls[control->name()] = ControlValue(*control);
+    return controls;
+}
+
 json StateJson::Forms(const ModuleState& shared) {
     json forms = json::object();
     for (const auto& [name, form] : shared.Forms)
         if (form)
             forms[name] = {{"visible", form->Visible()},
-                           {"controls", Controls(form->controls())},
+                           {"controls", FormControls(form->controls())},
                            {"selections", Selections(form->controls())}};
     return forms;
 }

@@ -41,6 +41,7 @@ public:
 
 private:
     static nlohmann::json Controls(const std::vector<Control*>& list);
+    static nlohmann::json FormControls(const std::vector<Control*>& list);
     static nlohmann::json Forms(const ModuleState& shared);
     static nlohmann::json GridCells(const Grid& grid);
     static nlohmann::json Selections(const std::vector<Control*>& list);
