@@ -1,6 +1,7 @@
 #include "platform/FileSystem.h"
 
 #include "platform/Ascii.h"
+#include "platform/FileReach.h"
 
 #include <dirent.h>
 #include <sys/stat.h>
@@ -61,6 +62,8 @@ Path ResolvePath(const Path& path) {
         }
         resolved += component;
     }
+    if (!FileReach::Allows(resolved))
+        return Path(FileReach::kOutside);
     return Path(resolved);
 }
 

@@ -2,6 +2,7 @@
 
 #include "platform/Encoding.h"
 #include "platform/Error.h"
+#include "platform/FileReach.h"
 #include "platform/FileSystem.h"
 
 #include <mntent.h>
@@ -82,6 +83,14 @@ std::vector<std::string> MountPoints(std::string_view mountsTable) {
 }
 
 std::vector<std::string> SystemMountPoints() {
+    // A thread held to some folders shows those folders as its drives.
+    if (!FileReach::Roots().empty()) {
+        std::vector<std::string> roots;
+        for (const std::string& root : FileReach::Roots())
+            if (ToUtf8(FromUtf8(root)) == root)
+                roots.push_back(FromUtf8(root));
+        return roots;
+    }
     FILE* table = setmntent("/proc/self/mounts", "r");
     std::vector<std::string> points = ReadMountPoints(table);
     if (table != nullptr)

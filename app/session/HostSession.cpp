@@ -33,12 +33,17 @@ HostSession::HostSession(ModuleState& shared)
     : HostSession(std::make_unique<MemorySettingsStore>(), shared) {}
 
 HostSession::HostSession(std::unique_ptr<SettingsStore> settings, ModuleState& shared)
-    : settings_(std::move(settings)), forms_([this](const json& request) { run(request); }),
-      shared_(shared) {
+    : HostSession(std::move(settings), shared, Setup()) {}
+
+HostSession::HostSession(std::unique_ptr<SettingsStore> settings, ModuleState& shared,
+                         const Setup& setup)
+    : shownMessages_(setup.messages ? setup.messages : &messages_), settings_(std::move(settings)),
+      forms_([this](const json& request) { run(request); }), shared_(shared) {
+    shownForms_ = setup.forms ? setup.forms : &forms_;
     addCardCommands();
     addEventCommands();
     addFileCommands();
-    newCard(0, json::object());
+    newCard(0, setup.elements);
 }
 
 HostSession::~HostSession() = default;
@@ -55,7 +60,7 @@ void HostSession::newCard(size_t slot, const json& elements) {
         if (!value.is_null())
             values[id] = value.is_string() ? HostArgs::Text(value, id) : value.dump();
     ElementsContainer container(std::move(values));
-    CardServices services{messages_, *settings_, forms_, clipboard_, browser_, clock_};
+    CardServices services{*shownMessages_, *settings_, *shownForms_, clipboard_, browser_, clock_};
     cards_[slot] = std::make_unique<Card>(services, shared_);
     current_ = slot;
     cards_[slot]->UserControl_InitProperties(&container);

@@ -31,6 +31,15 @@ namespace dovrel {
 // its module state, and ["use", 1 | 2] picks which one later requests go to.
 class HostSession {
 public:
+    // Who shows the controls' message boxes and side forms, when not the
+    // session's own recorder and script; and the container's page elements
+    // the first control starts in.
+    struct Setup {
+        Messages* messages = nullptr;
+        FormPresenter* forms = nullptr;
+        nlohmann::json elements = nlohmann::json::object();
+    };
+
     // A command takes the request's arguments and returns the members it adds
     // to the answer ("result", "value"), or an empty object. The session adds
     // "ok", the message boxes the call showed and the control's state.
@@ -39,6 +48,7 @@ public:
     // Settings kept in memory: nothing the user stored is read or changed.
     explicit HostSession(ModuleState& shared);
     HostSession(std::unique_ptr<SettingsStore> settings, ModuleState& shared);
+    HostSession(std::unique_ptr<SettingsStore> settings, ModuleState& shared, const Setup& setup);
     ~HostSession();
 
     // The answer to one input line, blank or not: one line of JSON. A line that
@@ -71,6 +81,8 @@ private:
     void addFileCommands();
 
     RecordedMessages messages_;
+    Messages* shownMessages_;
+    FormPresenter* shownForms_;
     std::unique_ptr<SettingsStore> settings_;
     MemoryClipboard clipboard_;
     RecordingBrowser browser_;
