@@ -17,6 +17,7 @@ void AddPrint(CLI::App& app, Runner& run);
 void AddCompanies(CLI::App& app, Runner& run);
 void AddAccount(CLI::App& app, Runner& run);
 void AddPictures(CLI::App& app, Runner& run);
+void AddServe(CLI::App& app, Runner& run);
 
 // --type: a document type's code, English name or Hebrew title; the help
 // lists them all, and anything else is a usage error.

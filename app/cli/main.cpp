@@ -142,6 +142,7 @@ int main(int argc, char** argv) {
     dovrel::AddCompanies(app, run);
     dovrel::AddAccount(app, run);
     dovrel::AddPictures(app, run);
+    dovrel::AddServe(app, run);
     if (UnknownCommand(app, argc, argv))
         return dovrel::kExitUsage;
     try {
