@@ -5,6 +5,7 @@
 #include "app/web/DesignJson.h"
 #include "control/ModuleState.h"
 #include "platform/FileReach.h"
+#include "platform/ListControls.h"
 
 #include <fstream>
 #include <iostream>
@@ -23,6 +24,24 @@ std::atomic<uint64_t> gNextId{1};
 const std::set<std::string> kPageCommands = {"state", "get",      "set",       "select",
                                              "click", "dblclick", "lostfocus", "call"};
 const std::set<std::string> kPageCalls = {"ShowDoc"};
+
+// The control's state, with the entries of its drop-down lists, which the
+// page cannot know from the design alone (the document types are read from
+// the company).
+json PageState(const Card& card) {
+    json state = StateJson::Build(card);
+    json lists = json::object();
+    for (const Control* control : card.controls())
+        if (control->kind() == ControlKind::ComboBox) {
+            const auto& list = static_cast<const ComboBox&>(*control);
+            json entries = json::array();
+            for (int32_t i = 0; i < list.ListCount(); ++i)
+                entries.push_back(StateJson::Text(list.List(i)));
+            lists[list.name()] = std::move(entries);
+        }
+    state["lists"] = std::move(lists);
+    return state;
+}
 
 std::string ReadFile(const std::string& path) {
     std::ifstream in(path, std::ios::binary);
@@ -86,7 +105,7 @@ void WebSession::run() {
 void WebSession::start(HostSession& host) {
     host_ = &host;
     static const json design = DesignJson::Build();
-    send({{"type", "hello"}, {"design", design}, {"state", StateJson::Build(host.card())}});
+    send({{"type", "hello"}, {"design", design}, {"state", PageState(host.card())}});
     // The card lives as long as the session: requests that make cards are
     // not the page's to send.
     progressWatch_ = host.card().ProgressFill.changed.connect([this] { progress(); });
@@ -138,6 +157,8 @@ void WebSession::request(const json& message) {
             return refuse(message, "A form is shown");
     }
     json reply = json::parse(host_->handle(request.dump()));
+    if (reply.contains("state"))
+        reply["state"] = PageState(host_->card());
     sendPrints(reply);
     reply["type"] = "reply";
     reply["id"] = message.value("id", json());
@@ -204,7 +225,7 @@ MsgAnswer WebSession::show(MsgIcon icon, MsgButtons buttons, const std::string& 
 void WebSession::ShowModal(Form& form) {
     form.Show();
     formsShown_.push_back(form.name());
-    send({{"type", "form"}, {"name", form.name()}, {"state", StateJson::Build(host_->card())}});
+    send({{"type", "form"}, {"name", form.name()}, {"state", PageState(host_->card())}});
     while (form.Visible()) {
         std::optional<json> message = next();
         if (!message) {

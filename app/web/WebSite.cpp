@@ -181,10 +181,9 @@ WebSite::Response WebSite::asset(const Request& request, std::string_view name) 
     secure(response.base());
     response.set(http::field::content_type, TypeOf(name));
     if (name == "index.html")
-        response.set(kPolicy,
-                     std::string(response[kPolicy]) +
-                         "; default-src 'self'; img-src 'self' data:; style-src 'self'; "
-                         "connect-src 'self'; object-src 'none'; base-uri 'none'");
+        response.set(kPolicy, std::string(response[kPolicy]) +
+                                  "; default-src 'self'; img-src 'self' data:; style-src 'self'; "
+                                  "connect-src 'self'; object-src 'none'; base-uri 'none'");
     response.body() = std::string(found->bytes);
     response.keep_alive(request.keep_alive());
     response.prepare_payload();
@@ -199,9 +198,8 @@ WebSite::Response WebSite::printed(const Request& request, std::string_view name
     secure(response.base());
     response.set(http::field::content_type, "text/html; charset=windows-1255");
     // The printed page runs no script; its pictures come from this server.
-    response.set(kPolicy,
-                 std::string(response[kPolicy]) +
-                     "; default-src 'none'; img-src 'self'; style-src 'unsafe-inline'");
+    response.set(kPolicy, std::string(response[kPolicy]) +
+                              "; default-src 'none'; img-src 'self'; style-src 'unsafe-inline'");
     response.body() = std::move(*page);
     response.keep_alive(request.keep_alive());
     response.prepare_payload();

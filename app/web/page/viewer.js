@@ -8,6 +8,7 @@ let socket = null;
 let design = null;
 let nextId = 1;
 let scale = 1;
+let lists = {};            // the drop-down lists' entries, which change at run time
 const forms = [];          // the forms shown, innermost last
 const cardElements = {};   // name -> element of the control
 const formElements = {};   // "FORM.NAME" -> element
@@ -107,7 +108,7 @@ function makeControl(d, name) {
 }
 
 function buttonPicture(picture) {
-    return { first: '\u23EE', prev: '\u25C0', next: '\u25B6', last: '\u23ED', print: '\u2399' }[
+    return { folder: '\u2026', print: '\u2399', settings: '\u2699' }[
         String(picture).toLowerCase()] || picture || '';
 }
 
@@ -150,6 +151,7 @@ function showValue(el, value, name) {
         if (document.activeElement !== el) el.value = value ?? '';
         break;
     case 'combo':
+        if (lists[name]) fillOptions(el, lists[name]);
         el.selectedIndex = value;
         break;
     case 'list':
@@ -176,6 +178,7 @@ function showValue(el, value, name) {
 function showState(state) {
     if (!state) return;
     window.lastState = state;
+    lists = state.lists || lists;
     for (const [name, value] of Object.entries(state.controls || {}))
         showValue(cardElements[name], value, name);
     if (cardElements.DocLines) showValue(cardElements.DocLines, state.grid, 'DocLines');
@@ -292,8 +295,8 @@ function started(message) {
     // command line does.
     const compDir = params.get('CompDir');
     if (compDir)
-        request('call', 'ShowDoc', compDir, Number(params.get('type') || 0),
-                Number(params.get('start') || 0));
+        request('call', 'ShowDoc', compDir, Number(params.get('type') || 20),
+                Number(params.get('start') || 2));
 }
 
 function receive(event) {
