@@ -4,10 +4,15 @@
 
 #include <boost/asio/connect.hpp>
 #include <boost/asio/ip/tcp.hpp>
+#include <boost/asio/ssl.hpp>
 #include <boost/beast/core.hpp>
 #include <boost/beast/http.hpp>
+#include <boost/beast/ssl.hpp>
 #include <boost/beast/websocket.hpp>
+#include <boost/beast/websocket/ssl.hpp>
 #include <gtest/gtest.h>
+#include <openssl/pem.h>
+#include <openssl/x509.h>
 
 #include <filesystem>
 #include <fstream>
@@ -178,6 +183,71 @@ TEST(WebServerTest, ForeignOriginsOversizedMessagesAndOnePageTooManyAreRefused) 
         status = client.get("/").result_int();
     }
     EXPECT_EQ(status, 200);
+}
+
+// A self-signed certificate for 127.0.0.1, written as PEM files.
+void WriteCertificate(const fs::path& cert, const fs::path& key) {
+    EVP_PKEY* pkey = EVP_EC_gen("P-256");
+    X509* x509 = X509_new();
+    ASN1_INTEGER_set(X509_get_serialNumber(x509), 1);
+    X509_gmtime_adj(X509_getm_notBefore(x509), 0);
+    X509_gmtime_adj(X509_getm_notAfter(x509), 3600);
+    X509_set_pubkey(x509, pkey);
+    X509_NAME* name = X509_get_subject_name(x509);
+    X509_NAME_add_entry_by_txt(name, "CN", MBSTRING_ASC,
+                               reinterpret_cast<const unsigned char*>("127.0.0.1"), -1, -1, 0);
+    X509_set_issuer_name(x509, name);
+    X509_sign(x509, pkey, EVP_sha256());
+    FILE* out = std::fopen(cert.c_str(), "w");
+    PEM_write_X509(out, x509);
+    std::fclose(out);
+    out = std::fopen(key.c_str(), "w");
+    PEM_write_PrivateKey(out, pkey, nullptr, nullptr, 0, nullptr, nullptr);
+    std::fclose(out);
+    X509_free(x509);
+    EVP_PKEY_free(pkey);
+}
+
+TEST(WebServerTest, HttpsServesThePageAndItsWebSocket) {
+    test::TempDir root;
+    ServeOptions options = Options(root.path());
+    options.tlsCert = (root.path() / "cert.pem").string();
+    options.tlsKey = (root.path() / "key.pem").string();
+    ServeOptions missing = options;
+    EXPECT_THROW(WebServer{missing}, Error) << "the files are not there yet";
+    WriteCertificate(options.tlsCert, options.tlsKey);
+    Running running(options);
+    EXPECT_EQ(running.server.url().substr(0, 8), "https://");
+
+    net::io_context context;
+    net::ssl::context tls(net::ssl::context::tls_client);
+    tls.set_verify_mode(net::ssl::verify_none);
+    std::string host = "127.0.0.1:" + std::to_string(running.server.port());
+    tcp::endpoint endpoint(net::ip::make_address("127.0.0.1"), running.server.port());
+
+    beast::ssl_stream<beast::tcp_stream> stream(context, tls);
+    beast::get_lowest_layer(stream).expires_after(std::chrono::seconds(20));
+    beast::get_lowest_layer(stream).connect(endpoint);
+    stream.handshake(net::ssl::stream_base::client);
+    http::request<http::empty_body> request(http::verb::get, "/", 11);
+    request.set(http::field::host, host);
+    http::write(stream, request);
+    beast::flat_buffer buffer;
+    http::response<http::string_body> response;
+    http::read(stream, buffer, response);
+    EXPECT_EQ(response.result_int(), 200);
+
+    websocket::stream<beast::ssl_stream<beast::tcp_stream>> ws(context, tls);
+    beast::get_lowest_layer(ws).expires_after(std::chrono::seconds(20));
+    beast::get_lowest_layer(ws).connect(endpoint);
+    ws.next_layer().handshake(net::ssl::stream_base::client);
+    ws.set_option(websocket::stream_base::decorator([host](websocket::request_type& upgrade) {
+        upgrade.set(http::field::origin, "https://" + host);
+    }));
+    ws.handshake(host, "/ws");
+    beast::flat_buffer hello;
+    ws.read(hello);
+    EXPECT_NE(beast::buffers_to_string(hello.data()).find("\"hello\""), std::string::npos);
 }
 
 } // namespace

@@ -15,6 +15,8 @@ struct ServeArgs {
     std::vector<std::string> roots;
     std::string listen = "127.0.0.1:8080";
     std::string tokenFile;
+    std::string tlsCert;
+    std::string tlsKey;
     std::vector<std::string> embedOrigins;
     size_t maxSessions = 32;
 };
@@ -54,6 +56,8 @@ ServeOptions Options(const ServeArgs& args) {
     options.port = static_cast<unsigned short>(std::stoul(port));
     if (!args.tokenFile.empty())
         options.token = ReadToken(args.tokenFile);
+    options.tlsCert = args.tlsCert;
+    options.tlsKey = args.tlsKey;
     options.embedOrigins = args.embedOrigins;
     options.maxSessions = args.maxSessions;
     options.settings = [] { return std::make_unique<SqliteSettingsStore>(); };
@@ -70,6 +74,8 @@ void AddServe(CLI::App& app, Runner& run) {
     serve->add_option("--listen", args->listen, "HOST:PORT to listen on (port 0: a free one)");
     serve->add_option("--token-file", args->tokenFile,
                       "File holding the token a browser must bring (needed off loopback)");
+    serve->add_option("--tls-cert", args->tlsCert, "Serve HTTPS with this certificate chain (PEM)");
+    serve->add_option("--tls-key", args->tlsKey, "The certificate's private key (PEM)");
     serve->add_option("--embed-origin", args->embedOrigins,
                       "An origin whose pages may show the viewer in a frame");
     serve->add_option("--max-sessions", args->maxSessions, "Most pages open at once")

@@ -4,6 +4,7 @@
 #include "app/web/WsConnection.h"
 
 #include <boost/beast/websocket.hpp>
+#include <boost/beast/websocket/ssl.hpp>
 
 namespace dovrel {
 namespace {
@@ -16,27 +17,52 @@ std::string PathOf(const WebSite::Request& request) {
     return std::string(target.substr(0, target.find('?')));
 }
 
-} // namespace
-
-HttpConnection::HttpConnection(boost::asio::ip::tcp::socket socket, WebServer& server)
-    : stream_(std::move(socket)), server_(server) {
+std::string PeerOf(const boost::asio::ip::tcp::socket& socket) {
     boost::system::error_code ec;
-    auto remote = stream_.socket().remote_endpoint(ec);
-    peer_ = ec ? "?" : remote.address().to_string();
+    auto remote = socket.remote_endpoint(ec);
+    return ec ? "?" : remote.address().to_string();
 }
 
-void HttpConnection::read() {
+} // namespace
+
+template <class Stream>
+HttpConnection<Stream>::HttpConnection(Stream stream, WebServer& server)
+    : stream_(std::move(stream)), server_(server) {
+    peer_ = PeerOf(beast::get_lowest_layer(stream_).socket());
+}
+
+template <class Stream> void HttpConnection<Stream>::start() {
+    if constexpr (std::is_same_v<Stream, TlsStream>) {
+        beast::get_lowest_layer(stream_).expires_after(server_.options().slowClient);
+        stream_.async_handshake(boost::asio::ssl::stream_base::server,
+                                [self = this->shared_from_this()](beast::error_code ec) {
+                                    if (ec)
+                                        return self->shutdown();
+                                    self->read();
+                                });
+    } else {
+        read();
+    }
+}
+
+template <class Stream> void HttpConnection<Stream>::shutdown() {
+    beast::error_code ec;
+    beast::get_lowest_layer(stream_).socket().shutdown(boost::asio::ip::tcp::socket::shutdown_both,
+                                                       ec);
+}
+
+template <class Stream> void HttpConnection<Stream>::read() {
     parser_.emplace();
     parser_->header_limit(static_cast<uint32_t>(server_.options().headerLimit));
     parser_->body_limit(server_.options().bodyLimit);
     buffer_.clear();
-    stream_.expires_after(server_.options().slowClient);
+    beast::get_lowest_layer(stream_).expires_after(server_.options().slowClient);
     http::async_read(
         stream_, buffer_, *parser_,
-        [self = shared_from_this()](beast::error_code ec, size_t) { self->onRead(ec); });
+        [self = this->shared_from_this()](beast::error_code ec, size_t) { self->onRead(ec); });
 }
 
-void HttpConnection::onRead(beast::error_code ec) {
+template <class Stream> void HttpConnection<Stream>::onRead(beast::error_code ec) {
     if (ec == http::error::header_limit || ec == http::error::body_limit ||
         ec == http::error::buffer_overflow) {
         WebServer::Log("refused a request too large from " + peer_);
@@ -48,8 +74,7 @@ void HttpConnection::onRead(beast::error_code ec) {
     if (ec) {
         if (ec == beast::error::timeout)
             WebServer::Log("dropped a client too slow from " + peer_);
-        stream_.socket().shutdown(boost::asio::ip::tcp::socket::shutdown_both, ec);
-        return;
+        return shutdown();
     }
     WebSite::Request request = parser_->release();
     if (beast::websocket::is_upgrade(request)) {
@@ -58,8 +83,8 @@ void HttpConnection::onRead(beast::error_code ec) {
             refusal->keep_alive(false);
             return reply(std::move(*refusal));
         }
-        stream_.expires_never();
-        std::make_shared<WsConnection>(std::move(stream_), server_, peer_)
+        beast::get_lowest_layer(stream_).expires_never();
+        std::make_shared<WsConnection<Stream>>(std::move(stream_), server_, peer_)
             ->start(std::move(request));
         return;
     }
@@ -69,28 +94,31 @@ void HttpConnection::onRead(beast::error_code ec) {
     reply(std::move(response));
 }
 
-void HttpConnection::refuse(const WebSite::Request& request, unsigned status) {
+template <class Stream>
+void HttpConnection<Stream>::refuse(const WebSite::Request& request, unsigned status) {
     WebServer::Log("refused " + std::to_string(status) + " " +
                    std::string(request.method_string()) + " " + PathOf(request) + " from " + peer_);
 }
 
-void HttpConnection::reply(WebSite::Response response) {
+template <class Stream> void HttpConnection<Stream>::reply(WebSite::Response response) {
     bool close = !response.keep_alive();
     response_ = std::move(response);
-    stream_.expires_after(server_.options().slowClient);
+    beast::get_lowest_layer(stream_).expires_after(server_.options().slowClient);
     http::async_write(stream_, *response_,
-                      [self = shared_from_this(), close](beast::error_code ec, size_t) {
+                      [self = this->shared_from_this(), close](beast::error_code ec, size_t) {
                           self->onWrite(close, ec);
                       });
 }
 
-void HttpConnection::onWrite(bool close, beast::error_code ec) {
+template <class Stream> void HttpConnection<Stream>::onWrite(bool close, beast::error_code ec) {
     response_.reset();
     if (ec || close) {
-        stream_.socket().shutdown(boost::asio::ip::tcp::socket::shutdown_send, ec);
-        return;
+        return shutdown();
     }
     read();
 }
+
+template class HttpConnection<PlainStream>;
+template class HttpConnection<TlsStream>;
 
 } // namespace dovrel

@@ -19,6 +19,10 @@ struct ServeOptions {
     unsigned short port = 8080;
     // Empty: no token (only allowed on a loopback address).
     std::string token;
+    // HTTPS with this certificate chain and private key (PEM files), or
+    // plain HTTP when both are empty.
+    std::string tlsCert;
+    std::string tlsKey;
     // Origins that may show the viewer in a frame; none by default.
     std::vector<std::string> embedOrigins;
     size_t maxSessions = 32;

@@ -27,6 +27,8 @@ ServeOptions Checked(ServeOptions options) {
             throw Error("Not a folder: " + root);
         root = FileReach::Real(root);
     }
+    if (options.tlsCert.empty() != options.tlsKey.empty())
+        throw Error("HTTPS needs both --tls-cert and --tls-key");
     if (options.maxSessions == 0)
         throw Error("--max-sessions must be at least 1");
     boost::system::error_code ec;
@@ -44,6 +46,8 @@ ServeOptions Checked(ServeOptions options) {
 WebServer::WebServer(ServeOptions options)
     : options_(Checked(std::move(options))),
       site_(options_, prints_, [this] { return openSessions(); }), acceptor_(context_) {
+    if (!options_.tlsCert.empty())
+        loadCertificate();
     tcp::endpoint endpoint(net::ip::make_address(options_.host), options_.port);
     boost::system::error_code ec;
     acceptor_.open(endpoint.protocol(), ec);
@@ -59,6 +63,20 @@ WebServer::WebServer(ServeOptions options)
     port_ = acceptor_.local_endpoint().port();
 }
 
+void WebServer::loadCertificate() {
+    tls_.emplace(net::ssl::context::tls_server);
+    tls_->set_options(net::ssl::context::default_workarounds | net::ssl::context::no_sslv2 |
+                      net::ssl::context::no_sslv3 | net::ssl::context::no_tlsv1 |
+                      net::ssl::context::no_tlsv1_1);
+    boost::system::error_code ec;
+    tls_->use_certificate_chain_file(options_.tlsCert, ec);
+    if (ec)
+        throw Error("Cannot read the certificate " + options_.tlsCert + ": " + ec.message());
+    tls_->use_private_key_file(options_.tlsKey, net::ssl::context::pem, ec);
+    if (ec)
+        throw Error("Cannot read the private key " + options_.tlsKey + ": " + ec.message());
+}
+
 WebServer::~WebServer() {
     stop();
 }
@@ -66,7 +84,8 @@ WebServer::~WebServer() {
 std::string WebServer::url() const {
     bool v6 = options_.host.find(':') != std::string::npos;
     std::string host = v6 ? "[" + options_.host + "]" : options_.host;
-    std::string url = "http://" + host + ":" + std::to_string(port_) + "/";
+    std::string url =
+        std::string(tls_ ? "https://" : "http://") + host + ":" + std::to_string(port_) + "/";
     if (!options_.token.empty())
         url += "?token=" + options_.token;
     return url;
@@ -98,13 +117,18 @@ WebServer::openSession(const std::map<std::string, std::string>& elements,
 }
 
 void WebServer::accept() {
-    acceptor_.async_accept(net::make_strand(context_),
-                           [this](boost::system::error_code ec, tcp::socket socket) {
-                               if (ec)
-                                   return;
-                               std::make_shared<HttpConnection>(std::move(socket), *this)->start();
-                               accept();
-                           });
+    acceptor_.async_accept(net::make_strand(context_), [this](boost::system::error_code ec,
+                                                              tcp::socket socket) {
+        if (ec)
+            return;
+        if (tls_)
+            std::make_shared<HttpConnection<TlsStream>>(TlsStream(std::move(socket), *tls_), *this)
+                ->start();
+        else
+            std::make_shared<HttpConnection<PlainStream>>(PlainStream(std::move(socket)), *this)
+                ->start();
+        accept();
+    });
 }
 
 void WebServer::run(bool stopOnSignals) {

@@ -7,10 +7,12 @@
 
 #include <boost/asio/io_context.hpp>
 #include <boost/asio/ip/tcp.hpp>
+#include <boost/asio/ssl/context.hpp>
 
 #include <map>
 #include <memory>
 #include <mutex>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -49,12 +51,14 @@ public:
 
 private:
     void accept();
+    void loadCertificate();
 
     ServeOptions options_;
     PrintStore prints_;
     WebSite site_;
     std::mutex sessionsMutex_;
     std::vector<std::shared_ptr<WebSession>> sessions_;
+    std::optional<boost::asio::ssl::context> tls_;
     boost::asio::io_context context_{1};
     boost::asio::ip::tcp::acceptor acceptor_;
     unsigned short port_ = 0;

@@ -153,7 +153,8 @@ WebSite::Response WebSite::respond(const Request& request) const {
     Response response = file(request, path);
     if (setCookie)
         response.set(http::field::set_cookie, std::string(kCookie) + "=" + options_.token +
-                                                  "; HttpOnly; SameSite=Strict; Path=/");
+                                                  "; HttpOnly; SameSite=Strict; Path=/" +
+                                                  (options_.tlsCert.empty() ? "" : "; Secure"));
     if (request.method() == http::verb::head)
         response.body().clear();
     return response;
@@ -245,7 +246,8 @@ std::optional<WebSite::Response> WebSite::refuseUpgrade(const Request& request) 
         return plain(request, http::status::unauthorized, "Open the address the server printed");
     std::string origin(request[http::field::origin]);
     std::string host(request[http::field::host]);
-    if (host.empty() || origin != "http://" + host)
+    std::string scheme = options_.tlsCert.empty() ? "http://" : "https://";
+    if (host.empty() || origin != scheme + host)
         return plain(request, http::status::forbidden, "The page comes from another site");
     std::string_view target = request.target();
     if (target.substr(0, target.find('?')) != "/ws")

@@ -1,6 +1,9 @@
 #include "app/web/WsConnection.h"
 
+#include "app/web/HttpConnection.h"
 #include "app/web/WebServer.h"
+
+#include <boost/beast/websocket/ssl.hpp>
 
 #include <boost/asio/post.hpp>
 
@@ -13,9 +16,9 @@ namespace net = boost::asio;
 
 // The session's way to the page: posted to the server's thread, and dropped
 // once the connection is gone.
-class SocketLink : public PageLink {
+template <class Connection> class SocketLink : public PageLink {
 public:
-    SocketLink(std::weak_ptr<WsConnection> connection, net::any_io_executor executor)
+    SocketLink(std::weak_ptr<Connection> connection, net::any_io_executor executor)
         : connection_(std::move(connection)), executor_(std::move(executor)) {}
 
     void send(std::string message) override {
@@ -32,16 +35,17 @@ public:
     }
 
 private:
-    std::weak_ptr<WsConnection> connection_;
+    std::weak_ptr<Connection> connection_;
     net::any_io_executor executor_;
 };
 
 } // namespace
 
-WsConnection::WsConnection(beast::tcp_stream stream, WebServer& server, std::string peer)
+template <class Stream>
+WsConnection<Stream>::WsConnection(Stream stream, WebServer& server, std::string peer)
     : ws_(std::move(stream)), server_(server), peer_(std::move(peer)) {}
 
-void WsConnection::start(WebSite::Request request) {
+template <class Stream> void WsConnection<Stream>::start(WebSite::Request request) {
     request_ = std::move(request);
     websocket::stream_base::timeout timeout{};
     timeout.handshake_timeout = server_.options().slowClient;
@@ -52,26 +56,27 @@ void WsConnection::start(WebSite::Request request) {
     const WebSite& site = server_.site();
     ws_.set_option(websocket::stream_base::decorator(
         [&site](websocket::response_type& response) { site.secure(response.base()); }));
-    ws_.async_accept(request_,
-                     [self = shared_from_this()](beast::error_code ec) { self->onAccept(ec); });
+    ws_.async_accept(
+        request_, [self = this->shared_from_this()](beast::error_code ec) { self->onAccept(ec); });
 }
 
-void WsConnection::onAccept(beast::error_code ec) {
+template <class Stream> void WsConnection<Stream>::onAccept(beast::error_code ec) {
     if (ec)
         return;
-    session_ =
-        server_.openSession(WebSite::Elements(request_),
-                            std::make_unique<SocketLink>(weak_from_this(), ws_.get_executor()));
+    session_ = server_.openSession(
+        WebSite::Elements(request_),
+        std::make_unique<SocketLink<WsConnection>>(this->weak_from_this(), ws_.get_executor()));
     WebServer::Log("page opened from " + peer_);
     read();
 }
 
-void WsConnection::read() {
-    ws_.async_read(buffer_,
-                   [self = shared_from_this()](beast::error_code ec, size_t) { self->onRead(ec); });
+template <class Stream> void WsConnection<Stream>::read() {
+    ws_.async_read(buffer_, [self = this->shared_from_this()](beast::error_code ec, size_t) {
+        self->onRead(ec);
+    });
 }
 
-void WsConnection::onRead(beast::error_code ec) {
+template <class Stream> void WsConnection<Stream>::onRead(beast::error_code ec) {
     if (ec) {
         if (ec == websocket::error::message_too_big)
             WebServer::Log("closed a page whose message was too large, from " + peer_);
@@ -82,7 +87,7 @@ void WsConnection::onRead(beast::error_code ec) {
     read();
 }
 
-void WsConnection::end() {
+template <class Stream> void WsConnection<Stream>::end() {
     if (ended_)
         return;
     ended_ = true;
@@ -91,7 +96,7 @@ void WsConnection::end() {
     WebServer::Log("page closed from " + peer_);
 }
 
-void WsConnection::queue(std::string message) {
+template <class Stream> void WsConnection<Stream>::queue(std::string message) {
     if (closing_)
         return;
     if (out_.size() >= kQueueLimit) {
@@ -106,10 +111,10 @@ void WsConnection::queue(std::string message) {
         write();
 }
 
-void WsConnection::write() {
+template <class Stream> void WsConnection<Stream>::write() {
     ws_.text(true);
     ws_.async_write(net::buffer(out_.front()),
-                    [self = shared_from_this()](beast::error_code ec, size_t) {
+                    [self = this->shared_from_this()](beast::error_code ec, size_t) {
                         if (ec)
                             return self->end();
                         self->out_.pop_front();
@@ -120,13 +125,16 @@ void WsConnection::write() {
                     });
 }
 
-void WsConnection::shut() {
+template <class Stream> void WsConnection<Stream>::shut() {
     closing_ = true;
     if ((!out_.empty() && !ended_) || closeSent_)
         return; // closed once the queued messages are out
     closeSent_ = true;
     ws_.async_close(websocket::close_code::normal,
-                    [self = shared_from_this()](beast::error_code) { self->end(); });
+                    [self = this->shared_from_this()](beast::error_code) { self->end(); });
 }
+
+template class WsConnection<PlainStream>;
+template class WsConnection<TlsStream>;
 
 } // namespace dovrel

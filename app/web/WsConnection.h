@@ -18,9 +18,10 @@ class WebServer;
 // session's messages come back in order. A message over the size limit, a
 // page silent past the idle time, or a page that cannot keep up closes it,
 // which ends the session.
-class WsConnection : public std::enable_shared_from_this<WsConnection> {
+template <class Stream>
+class WsConnection : public std::enable_shared_from_this<WsConnection<Stream>> {
 public:
-    WsConnection(boost::beast::tcp_stream stream, WebServer& server, std::string peer);
+    WsConnection(Stream stream, WebServer& server, std::string peer);
     void start(WebSite::Request request);
 
     // On the server's thread.
@@ -37,7 +38,7 @@ private:
     void write();
     void end();
 
-    boost::beast::websocket::stream<boost::beast::tcp_stream> ws_;
+    boost::beast::websocket::stream<Stream> ws_;
     WebServer& server_;
     std::string peer_;
     WebSite::Request request_;
