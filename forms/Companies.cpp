@@ -1,6 +1,7 @@
 #include "forms/Companies.h"
 
 #include "platform/Ascii.h"
+#include "platform/FileReach.h"
 
 #include "fixfiles/TextDecoding.h"
 #include "platform/Encoding.h"
@@ -109,6 +110,9 @@ std::vector<std::string> Subdirectories(const std::string& root) {
 // letter case (the first in name order when there are several); empty when
 // there is none or the directory cannot be listed.
 fs::path CompanyFileIn(const fs::path& dir) {
+    // A link out of the folders this thread is held to is no company of it.
+    if (!FileReach::Allows(dir.string()))
+        return {};
     std::error_code ec;
     fs::directory_iterator it(dir, ec);
     std::vector<std::string> found;

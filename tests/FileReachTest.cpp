@@ -1,5 +1,6 @@
 #include "platform/FileReach.h"
 #include "TestCompany.h"
+#include "forms/Companies.h"
 #include "platform/FileSystem.h"
 #include "platform/ListControls.h"
 
@@ -35,6 +36,11 @@ TEST(FileReachTest, AThreadHeldToAFolderReachesOnlyWhatLiesInIt) {
         EXPECT_FALSE(FileExists(Path(refused.string()))) << refused;
         EXPECT_EQ(ResolvePath(Path(refused.string())).native(), FileReach::kOutside) << refused;
     }
+    // The chooser's scan does not name a company behind a link out.
+    sample::WriteCompany(R"({"company": {"title": "in"}})", root / "co");
+    sample::WriteCompany(R"({"company": {"title": "out"}})", outside);
+    EXPECT_EQ(FindCompanies(FromUtf8(root.string())).size(), 1u);
+
     std::vector<std::string> drives = SystemMountPoints();
     ASSERT_EQ(drives.size(), 1u);
     EXPECT_EQ(drives[0], fs::canonical(root).string());

@@ -61,7 +61,7 @@ WebSite::WebSite(const ServeOptions& options, PrintStore& prints,
                  std::function<size_t()> openSessions)
     : options_(options), prints_(prints), openSessions_(std::move(openSessions)) {}
 
-std::string WebSite::Decode(std::string_view text) {
+std::string WebSite::Decode(std::string_view text, bool plusIsSpace) {
     std::string out;
     for (size_t i = 0; i < text.size(); ++i) {
         char c = text[i];
@@ -71,7 +71,7 @@ std::string WebSite::Decode(std::string_view text) {
             out += static_cast<char>(std::stoi(std::string(text.substr(i + 1, 2)), nullptr, 16));
             i += 2;
         } else {
-            out += c == '+' ? ' ' : c;
+            out += c == '+' && plusIsSpace ? ' ' : c;
         }
     }
     return out;
@@ -171,7 +171,7 @@ WebSite::Response WebSite::file(const Request& request, std::string_view path) c
         return asset(request, path.substr(1));
     if (path.starts_with("/print/"))
         return printed(request, path.substr(7));
-    return picture(request, Decode(path));
+    return picture(request, Decode(path, false));
 }
 
 WebSite::Response WebSite::asset(const Request& request, std::string_view name) const {

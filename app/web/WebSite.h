@@ -38,7 +38,8 @@ public:
     // The headers every answer carries; the WebSocket's handshake too.
     void secure(boost::beast::http::fields& fields) const;
 
-    static std::string Decode(std::string_view text);
+    // Undoes %XX escapes; a query's "+" is a space, a path's is itself.
+    static std::string Decode(std::string_view text, bool plusIsSpace = true);
     static std::map<std::string, std::string> Query(std::string_view target);
 
 private:
