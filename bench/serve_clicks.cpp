@@ -22,6 +22,7 @@
 #include <chrono>
 #include <cstdio>
 #include <fcntl.h>
+#include <filesystem>
 #include <fstream>
 #include <iostream>
 #include <mutex>
@@ -116,6 +117,11 @@ int main(int argc, char** argv) {
     int clients = argc > 3 ? std::clamp(std::atoi(argv[3]), 1, 200) : 50;
     int clicks = argc > 4 ? std::clamp(std::atoi(argv[4]), 1, 10000) : 200;
 
+    // The server's settings go to a folder of their own, not the user's.
+    char config[] = "/tmp/dovrel-serve-bench-XXXXXX";
+    if (mkdtemp(config) == nullptr)
+        return 1;
+    setenv("XDG_CONFIG_HOME", config, 1);
     int out[2];
     if (pipe(out) != 0)
         return 1;
@@ -150,6 +156,7 @@ int main(int argc, char** argv) {
     long peak = PeakKiB(pid);
     kill(pid, SIGTERM);
     waitpid(pid, nullptr, 0);
+    std::filesystem::remove_all(config);
 
     std::sort(gTrips.begin(), gTrips.end());
     auto percentile = [](double p) {
