@@ -37,9 +37,10 @@ struct Document {
         double quantity = 0;
         double price = 0; // in the line's currency
         uint8_t currency = 0;
-        std::string currencyName; // the Hebrew abbreviation the control shows
-        double discount = 0;      // percent
-        double total = 0;         // in shekels
+        std::string currencyName;    // the Hebrew abbreviation the control shows
+        std::string currencyPrinted; // the code the English page prints
+        double discount = 0;         // percent
+        double total = 0;            // in shekels
     };
 
     struct Totals {

@@ -10,6 +10,7 @@
 #include "platform/Encoding.h"
 #include "platform/Error.h"
 #include "platform/FileSystem.h"
+#include "platform/Messages.h"
 
 #include <algorithm>
 #include <array>
@@ -17,6 +18,8 @@
 #include <cstring>
 #include <limits>
 #include <optional>
+#include <tuple>
+#include <utility>
 #include <vector>
 
 namespace dovrel {
@@ -85,12 +88,27 @@ public:
     StockRead run(const Path& pCompPath, int16_t pWizFile, const std::string& pStartFrom,
                   const std::string& pFromDate);
 
-private:
     struct Candidate {
         bool accepted = false;
         int64_t end = 0; // the last record the document consumed
     };
 
+    // For a walk over every document of a file: the file and the dates that
+    // bound the documents taken.
+    void prepareWalk(const Path& file, std::optional<Date> from, std::optional<Date> to) {
+        file_ = file;
+        fromDate_ = from;
+        toDate_ = to;
+    }
+    // Tries the header at record `at`, as the view's record position; the
+    // document accepted is then taken with takeFound.
+    Candidate tryAt(RecordFile& file, const unsigned char* headerRec, int64_t at) {
+        view_.PubACTLocation = static_cast<int32_t>(at);
+        return tryDocument(file, headerRec, at);
+    }
+    std::optional<Document> takeFound() { return std::exchange(found_, std::nullopt); }
+
+private:
     Walk planWalk(const std::string& direction, int64_t records);
     Candidate tryDocument(RecordFile& file, const unsigned char* headerRec, int64_t at);
     bool passesHeader(const unsigned char* h, bool& matched);
@@ -111,6 +129,7 @@ private:
     std::optional<FieldPrefilter> lineFilter_;
     ProgressBar progress_;
     std::optional<Date> fromDate_;
+    std::optional<Date> toDate_;
     uint8_t code_ = 0;
     Path file_;
     // The document being loaded.
@@ -203,7 +222,7 @@ Document::Line LineOf(const unsigned char* rec, const CompanyRecord& company) {
     line.price = Checked(DoubleAt(rec, 108));
     line.total = Checked(DoubleAt(rec, 116));
     line.currency = rec[72];
-    line.currencyName = CurrencyNames(line.currency, company).first;
+    std::tie(line.currencyName, line.currencyPrinted) = CurrencyNames(line.currency, company);
     line.discount = Int16At(rec, 156) / 100.0;
     if (!line.itemKey.logical.empty() && (line.lineNumber < 1 || line.lineNumber > kMaxDocLines))
         throw Error("Line number " + std::to_string(line.lineNumber) + " is outside 1 to " +
@@ -306,7 +325,7 @@ StockScan::Candidate StockScan::tryDocument(RecordFile& file, const unsigned cha
         return {false, at + 1};
     Record cont;
     std::memcpy(cont.data(), contRec, cont.size());
-    if (fromDate_ && DateOf(cont) < *fromDate_)
+    if ((fromDate_ && DateOf(cont) < *fromDate_) || (toDate_ && DateOf(cont) > *toDate_))
         return {false, at + 1};
 
     // A line search looks for its line first; the document it finds is then
@@ -475,6 +494,60 @@ int32_t ReadStock(DocumentView& view, const StockContext& context, const Path& p
     }
     view.ProgressFill.setWidth(0);
     return read.stoppedAt;
+}
+
+// What a walk holds: a view and a current document of its own, which nobody
+// sees, the file and the scan that decodes the documents.
+struct DocumentWalk::Scan {
+    Scan(const Path& path, const CompanyRecord& company)
+        : context{types, files, company, current, messages}, file(path, kDocRecordLength),
+          scan(view, context, std::string(), none) {}
+
+    DocTypeTable types;
+    DocFileTable files;
+    CurrentDocument current;
+    RecordedMessages messages;
+    StockContext context;
+    DocumentView view;
+    RecordFile file;
+    Variant none = Variant(std::string());
+    StockScan scan;
+};
+
+DocumentWalk::DocumentWalk(const Path& path, Types types, const CompanyRecord& company,
+                           std::optional<Date> from, std::optional<Date> to)
+    : scan_(std::make_unique<Scan>(path, company)), types_(types) {
+    scan_->scan.prepareWalk(path, from, to);
+    double exact = static_cast<double>(scan_->file.length()) / kDocRecordLength;
+    records_ = static_cast<int64_t>(std::nearbyint(exact));
+}
+
+DocumentWalk::~DocumentWalk() = default;
+
+DocumentWalk::Step DocumentWalk::next() {
+    Step step;
+    while (position_ <= records_) {
+        int64_t at = position_++;
+        const unsigned char* rec = scan_->file.record(at);
+        if (rec == nullptr || rec[0] != 1 || !types_.test(rec[1]))
+            continue;
+        // The walk goes on after the document's records, whatever came of it:
+        // its line records are never taken for headers.
+        position_ = at + 2 + rec[158];
+        step.record = static_cast<int32_t>(at);
+        step.type = rec[1];
+        try {
+            if (!scan_->scan.tryAt(scan_->file, rec, at).accepted)
+                continue;
+            step.kind = Step::Kind::Document;
+            step.document = scan_->scan.takeFound();
+        } catch (const std::exception& e) {
+            step.kind = Step::Kind::Damaged;
+            step.error = e.what();
+        }
+        return step;
+    }
+    return {};
 }
 
 } // namespace dovrel

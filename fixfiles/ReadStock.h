@@ -9,7 +9,9 @@
 #include "platform/Path.h"
 #include "platform/Variant.h"
 
+#include <bitset>
 #include <cstdint>
+#include <memory>
 #include <optional>
 #include <string>
 
@@ -54,5 +56,45 @@ StockRead WalkStock(DocumentView& view, const StockContext& context, const Path&
 int32_t ReadStock(DocumentView& view, const StockContext& context, const Path& pCompPath,
                   int16_t pWizFile, const std::string& pSearchBy, const Variant& pSearchValue,
                   const std::string& pStartFrom, const std::string& pFromDate);
+
+// Every document of a set of types in one document file, in the order of the
+// file, each decoded as the reader accepts it, for work over many documents
+// (export, printing a batch). The file stays open for the walk, which goes on
+// after the records a document took; memory does not grow with the file. A
+// document that cannot be read (more lines than the control holds, an amount
+// that is not a number) is given with its error, and the walk goes on after
+// its records.
+class DocumentWalk {
+public:
+    struct Step {
+        enum class Kind { Document, Damaged, End };
+        Kind kind = Kind::End;
+        std::optional<Document> document; // a Document
+        int32_t record = 0;               // the header record
+        uint8_t type = 0;
+        std::string error; // a Damaged document's description, UTF-8
+    };
+    using Types = std::bitset<256>;
+
+    // Opens the document file at path (an error when it cannot be opened).
+    // Only documents dated from `from` to `to` (when given) are taken.
+    DocumentWalk(const Path& path, Types types, const CompanyRecord& company,
+                 std::optional<Date> from = std::nullopt, std::optional<Date> to = std::nullopt);
+    ~DocumentWalk();
+    DocumentWalk(const DocumentWalk&) = delete;
+    DocumentWalk& operator=(const DocumentWalk&) = delete;
+
+    Step next();
+    // The record the walk is at and the records of the file, for progress.
+    int64_t position() const { return position_; }
+    int64_t records() const { return records_; }
+
+private:
+    struct Scan;
+    std::unique_ptr<Scan> scan_;
+    Types types_;
+    int64_t position_ = 2;
+    int64_t records_ = 0;
+};
 
 } // namespace dovrel

@@ -12,6 +12,7 @@ enum ExitCode : int {
     kExitFailed = 1,
     kExitUsage = 2,    // the command line itself is wrong
     kExitNotFound = 3, // no such document, account, company, range or setting
+    kExitSkipped = 4,  // done, but damaged documents were reported and left out
 };
 
 // A failure that ends a command with a code other than 1.

@@ -62,6 +62,13 @@ void AddTypeOption(CLI::App& command, int16_t& type) {
         ->transform(CLI::Validator(TypeToCode, "", "document type"));
 }
 
+void AddTypesOption(CLI::App& command, std::vector<int16_t>& types) {
+    command.add_option("--type", types, TypeList())
+        ->type_name("TYPE")
+        ->take_all()
+        ->transform(CLI::Validator(TypeToCode, "", "document type"));
+}
+
 void AddTodayOption(CLI::App& command, std::string& today, const std::string& about) {
     command.add_option("--today", today, about)
         ->type_name("YYYY-MM-DD")

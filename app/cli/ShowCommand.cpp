@@ -3,6 +3,8 @@
 #include "app/cli/CompanyDir.h"
 #include "app/cli/ExitCode.h"
 #include "app/session/StateJson.h"
+#include "app/export/ExportRecord.h"
+#include "app/export/ItemCategories.h"
 #include "fixfiles/DateSerial.h"
 #include "fixfiles/DocTypes.h"
 #include "fixfiles/Formats.h"
@@ -72,8 +74,6 @@ int ShowCommand::run(std::ostream& out, std::ostream& err) {
     watchProgress(card);
     read(card);
     std::vector<RecordedMessages::Shown> shown = messages.take();
-    if (options_.json)
-        out << StateJson::Dump(StateJson::BuildFromDocument(card), 2) << '\n';
     for (const auto& message : shown)
         err << "dovrel: " << ToTerminal(message.title) << ": " << ToTerminal(message.text) << '\n';
     if (!shown.empty())
@@ -83,7 +83,9 @@ int ShowCommand::run(std::ostream& out, std::ostream& err) {
             << " at or after record " << options_.start << '\n';
         return kExitNotFound;
     }
-    if (!options_.json)
+    if (options_.json)
+        printJson(*card.document(), compDir, out);
+    else
         printDocument(card, out);
     return kExitDone;
 }
@@ -114,35 +116,43 @@ void ShowCommand::watchProgress(Card& card) {
     });
 }
 
+// The document as one record of `dovrel export`, its lines with the
+// categories of their items.
+void ShowCommand::printJson(Document document, const Path& compDir, std::ostream& out) const {
+    ItemCategories(compDir).apply(document);
+    out << ExportRecord::Json(document).dump(2) << '\n';
+}
+
 void ShowCommand::printDocument(const Card& card, std::ostream& out) const {
     const Document& document = *card.document();
     printHeader(document, out);
     out << '\n';
     Grid lines(card.DocLines.name());
     DocumentView::FillLines(lines, &document);
-    printLines(lines, out);
+    printLines(lines, document, out);
     out << '\n';
     printTotals(document, out);
     printRemarks(document, out);
 }
 
 void ShowCommand::printHeader(const Document& document, std::ostream& out) const {
-    if (!document.companyTitle.logical.empty())
-        out << ToTerminal(document.companyTitle.logical) << "\n\n";
+    if (!document.companyTitle.reading.empty())
+        out << ToTerminal(document.companyTitle.reading) << "\n\n";
     const DocTypeRow& type = shared_.DocTypes[static_cast<size_t>(row_)];
     std::vector<Field> fields = {
         {"סוג מסמך", ToTerminal(type.hebrewTitle) + " (" + std::to_string(type.code) + ")"},
-        {"אסמכתא", ToTerminal(document.reference.logical)},
+        {"אסמכתא", ToTerminal(document.reference.reading)},
         {"תאריך", FormatDate(document.date)},
-        {"כרטיס", ToTerminal(document.accountKey.logical)},
-        {"שם", ToTerminal(document.customer.logical)},
-        {"כתובת", ToTerminal(document.address1.logical)}};
-    if (!document.address2.logical.empty())
-        fields.push_back({"", ToTerminal(document.address2.logical)});
+        {"כרטיס", ToTerminal(document.accountKey.reading)},
+        {"שם", ToTerminal(document.customer.reading)},
+        {"כתובת", ToTerminal(document.address1.reading)}};
+    if (!document.address2.reading.empty())
+        fields.push_back({"", ToTerminal(document.address2.reading)});
     PrintFields(fields, out);
 }
 
-void ShowCommand::printLines(const Grid& grid, std::ostream& out) const {
+// The grid's cells, with the texts of the lines in reading order.
+void ShowCommand::printLines(const Grid& grid, const Document& document, std::ostream& out) const {
     std::vector<std::vector<std::string>> table;
     for (int32_t row = 0; row < grid.Rows(); ++row) {
         std::vector<std::string> cells;
@@ -150,6 +160,19 @@ void ShowCommand::printLines(const Grid& grid, std::ostream& out) const {
         for (int32_t col = 0; col < grid.Cols(); ++col) {
             cells.push_back(Utf8Trimmed(grid.TextMatrix(row, col)));
             empty = empty && cells.back().empty();
+        }
+        if (row >= 1 && static_cast<size_t>(row) <= document.lines.size() && cells.size() > 3) {
+            const Document::Line& line = document.lines[static_cast<size_t>(row - 1)];
+            if (!cells[1].empty())
+                cells[1] = Utf8Trimmed(line.itemKey.reading);
+            cells[2] = Utf8Trimmed(line.description.reading);
+            if (!cells[3].empty())
+                cells[3] = Utf8Trimmed(line.details.reading);
+            if (!line.textOnly && line.currency >= 10 && line.currency <= 18 && cells.size() > 6) {
+                const DocumentText& name = document.currencyNames[line.currency - 10u];
+                if (!name.reading.empty())
+                    cells[6] = Utf8Trimmed(name.reading);
+            }
         }
         if (row == 0 || !empty)
             table.push_back(std::move(cells));
@@ -182,8 +205,8 @@ void ShowCommand::printTotals(const Document& document, std::ostream& out) const
 void ShowCommand::printRemarks(const Document& document, std::ostream& out) const {
     std::vector<std::string> remarks;
     for (const DocumentText& remark : document.remarks)
-        if (!Trim(remark.logical).empty())
-            remarks.push_back(Utf8Trimmed(remark.logical));
+        if (!Trim(remark.reading).empty())
+            remarks.push_back(Utf8Trimmed(remark.reading));
     if (remarks.empty())
         return;
     out << "\nהערות:\n";

@@ -20,7 +20,7 @@ struct ShowOptions {
 
 // `dovrel show`: reads the first document of a type at or after a record, as
 // the control's ShowDoc does, and prints the document the control shows for a
-// person (UTF-8, reading order) or as the control's state in JSON.
+// person (UTF-8, reading order) or as JSON, one record of `dovrel export`.
 class ShowCommand {
 public:
     ShowCommand(ShowOptions options, ModuleState& shared);
@@ -37,9 +37,10 @@ public:
 private:
     void read(Card& card);
     void watchProgress(Card& card);
+    void printJson(Document document, const Path& compDir, std::ostream& out) const;
     void printDocument(const Card& card, std::ostream& out) const;
     void printHeader(const Document& document, std::ostream& out) const;
-    void printLines(const Grid& grid, std::ostream& out) const;
+    void printLines(const Grid& grid, const Document& document, std::ostream& out) const;
     void printTotals(const Document& document, std::ostream& out) const;
     void printRemarks(const Document& document, std::ostream& out) const;
 

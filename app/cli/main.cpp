@@ -30,7 +30,8 @@ void AddShow(CLI::App& app, Runner& run) {
     dovrel::AddTypeOption(*show, options->type);
     show->add_option("--start", options->start, "First record to look at (default 2)")
         ->check(CLI::Range(1, std::numeric_limits<int32_t>::max()));
-    show->add_flag("--json", options->json, "Print the control's state as JSON");
+    show->add_flag("--json", options->json,
+                   "Print the document as JSON, one record of dovrel export");
     show->callback([options, &run] {
         run = [options] {
             dovrel::ModuleState state;
@@ -83,7 +84,8 @@ void AddSettings(CLI::App& app, Runner& run) {
 
 const char* const kExitCodes =
     "Exit codes: 0 done, 1 failed, 2 usage (a wrong command line), 3 nothing found (no such "
-    "document, account, company, range or setting).\n";
+    "document, account, company, range or setting), 4 done but damaged documents were skipped "
+    "(export, print).\n";
 
 // A first word that is not a command gets its own message, with the commands.
 bool UnknownCommand(CLI::App& app, int argc, char** argv) {
@@ -143,6 +145,7 @@ int main(int argc, char** argv) {
     dovrel::AddAccount(app, run);
     dovrel::AddPictures(app, run);
     dovrel::AddServe(app, run);
+    dovrel::AddExport(app, run);
     if (UnknownCommand(app, argc, argv))
         return dovrel::kExitUsage;
     try {
