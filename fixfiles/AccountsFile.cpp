@@ -2,6 +2,7 @@
 
 #include "fixfiles/ItemsFile.h"
 #include "fixfiles/ProgressReset.h"
+#include "fixfiles/ReadingOrder.h"
 #include "fixfiles/RecordFields.h"
 #include "fixfiles/RecordFile.h"
 #include "fixfiles/TextDecoding.h"
@@ -29,6 +30,11 @@ std::string LogicalField(const unsigned char* record, size_t offset, size_t widt
     return TrimCopy(LogicalText(text));
 }
 
+// The same field in the order people read it, for lists outside the control.
+std::string ReadingField(const unsigned char* record, size_t offset, size_t width) {
+    return ReadingOrderText(Field(record, offset, width));
+}
+
 std::string KeyOf(const unsigned char* record) {
     return TrimCopy(LogicalText(Field(record, kAccountKeyOffset, kAccountKeyWidth)));
 }
@@ -39,6 +45,15 @@ AccountEntry EntryOf(const unsigned char* record, std::string key) {
     entry.Phone = TrimCopy(Field(record, kPhoneOffset, kPhoneWidth));
     entry.Details = LogicalField(record, kDetailsOffset, kDetailsWidth);
     entry.District = LogicalField(record, kDistrictOffset, kDistrictWidth);
+    return entry;
+}
+
+AccountEntry ReadingEntryOf(const unsigned char* record, std::string key) {
+    AccountEntry entry;
+    entry.Key = std::move(key);
+    entry.Phone = ReadingField(record, kPhoneOffset, kPhoneWidth);
+    entry.Details = ReadingField(record, kDetailsOffset, kDetailsWidth);
+    entry.District = ReadingField(record, kDistrictOffset, kDistrictWidth);
     return entry;
 }
 
@@ -84,7 +99,8 @@ AccountEntry FindAccount(const AccountsTable& table, const std::string& key) {
     return NoAccount();
 }
 
-AccountEntry FindAccountInFile(const Path& CompPath, const std::string& key, ProgressBar progress) {
+AccountEntry FindAccountInFile(const Path& CompPath, const std::string& key, ProgressBar progress,
+                               TextOrder order) {
     RecordFile file(ResolvePath(CompPath.plus("\\ACT.fix")), kActRecordLength);
     int64_t last = LastScanRecord(file.length(), kActRecordLength);
     ProgressReset resetter(progress);
@@ -93,7 +109,8 @@ AccountEntry FindAccountInFile(const Path& CompPath, const std::string& key, Pro
         if (record == nullptr)
             break;
         if (std::string found = KeyOf(record); !found.empty() && EqualsNoCase(found, key))
-            return EntryOf(record, std::move(found));
+            return order == TextOrder::Reading ? ReadingEntryOf(record, std::move(found))
+                                               : EntryOf(record, std::move(found));
         if (n % kProgressEvery == 0)
             progress.show(n, last);
     }

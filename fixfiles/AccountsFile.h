@@ -37,9 +37,14 @@ bool ReadACT(const Path& CompPath, AccountsTable& table, ProgressBar progress);
 // case; when there is none, an empty key and "ריק" in the other three fields.
 AccountEntry FindAccount(const AccountsTable& table, const std::string& key);
 
+// The order of an account's phone, details and district: as the control shows
+// them (LogicalText), or as people read them, for front ends outside it.
+enum class TextOrder { Logical, Reading };
+
 // What ReadACT and then FindAccount give, read straight from the file: the
 // scan stops at the first match and holds one record at a time, so its memory
 // does not grow with the file. The table is not touched.
-AccountEntry FindAccountInFile(const Path& CompPath, const std::string& key, ProgressBar progress);
+AccountEntry FindAccountInFile(const Path& CompPath, const std::string& key, ProgressBar progress,
+                               TextOrder order = TextOrder::Logical);
 
 } // namespace dovrel

@@ -3,6 +3,7 @@
 #include "platform/Ascii.h"
 #include "platform/FileReach.h"
 
+#include "fixfiles/ReadingOrder.h"
 #include "fixfiles/TextDecoding.h"
 #include "platform/Encoding.h"
 #include "platform/Error.h"
@@ -193,9 +194,10 @@ std::vector<CompanyEntry> FindCompanies(const std::string& root) {
         fs::path file = CompanyFileIn(nativeMain / native);
         if (file.empty())
             continue;
-        std::string companyName = WAsc2Heb(Trim(ReadStoredName(file)));
+        std::string stored = ReadStoredName(file);
+        std::string companyName = WAsc2Heb(Trim(stored));
         companyName.resize(kCompanyNameField, ' ');
-        table.push_back({main + name, std::move(companyName)});
+        table.push_back({main + name, std::move(companyName), ReadingOrderText(stored)});
     }
     if (!table.empty())
         SortCompanies(table, 0, static_cast<int32_t>(table.size()) - 1);

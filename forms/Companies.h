@@ -19,6 +19,9 @@ struct CompanyEntry {
     std::string path;
     // The stored name converted by WAsc2Heb, space-filled or cut to 20 bytes.
     std::string name;
+    // The stored name in the order people read it, trimmed, for lists
+    // outside the control.
+    std::string readingName;
 };
 
 // A stored company name (DOS Hebrew, visual order) as text in logical order,

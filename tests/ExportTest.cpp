@@ -125,8 +125,9 @@ TEST(ExportTest, TheDemoComesBackAsItsDescriptionHasItInBothFormats) {
                 EXPECT_EQ(csvRows[i][column[field]], shown[i].value(field, "")) << where;
             }
             int currency = shown[i].value("currency", 21);
-            if (shown[i]["key"] != "*" && currency >= 10 && currency <= 18)
+            if (shown[i]["key"] != "*" && currency >= 10 && currency <= 18) {
                 EXPECT_EQ(line["currency"]["name"], companyCurrencies.at(size_t(currency - 10)));
+            }
         }
     }
     EXPECT_EQ(exported.size(), documents);
@@ -176,6 +177,23 @@ TEST(ExportTest, DamagedDocumentsAreSkippedAndReported) {
     EXPECT_EQ(rows[0][0], "type");
     EXPECT_EQ(rows[2][4], "4");
     EXPECT_EQ(rows[2][7], "אחרון");
+}
+
+// The other lists people read: an account's texts and the company names.
+TEST(ExportTest, AccountsAndCompaniesComeInReadingOrder) {
+    json demo = Demo();
+    for (const json& account : demo["accounts"]) {
+        auto [code, out, err] = RunCli({"account", DOVREL_DEMO_DIR, account["key"], "--json"});
+        ASSERT_EQ(code, 0) << err;
+        json got = json::parse(out);
+        for (const char* field : {"phone", "details", "district"})
+            EXPECT_EQ(got[field], account[field]) << account["key"] << " " << field;
+    }
+    test::TempDir main;
+    std::filesystem::copy(DOVREL_DEMO_DIR, main.path() / "demo");
+    auto [code, out, err] = RunCli({"companies", main.str(), "--json"});
+    ASSERT_EQ(code, 0) << err;
+    EXPECT_EQ(json::parse(out)[0]["name"], demo["company"]["name"]);
 }
 
 } // namespace

@@ -24,7 +24,7 @@ int AccountCommand::run(std::ostream& out) {
     Shape fill("ProgressFill", 0, 0, 0, 100);
     Path compDir(options_.compDir);
     CheckCompanyDir(compDir);
-    AccountEntry account = FindAccountInFile(compDir, key, {frame, fill});
+    AccountEntry account = FindAccountInFile(compDir, key, {frame, fill}, TextOrder::Reading);
     if (options_.json) {
         nlohmann::json answer = {{"key", ToUtf8(key)},
                                  {"found", !account.Key.empty()},

@@ -23,9 +23,9 @@ int CompaniesCommand::run(std::ostream& out, std::ostream& err) {
     nlohmann::json list = nlohmann::json::array();
     size_t listed = 0;
     for (const CompanyEntry& entry : FindCompanies(root)) {
-        std::string name = ListedName(entry);
-        if (name.empty())
+        if (ListedName(entry).empty())
             continue;
+        const std::string& name = entry.readingName;
         ++listed;
         if (options_.json)
             list.push_back({{"name", ToUtf8(name)}, {"path", ToUtf8(entry.path)}});
