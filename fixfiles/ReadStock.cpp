@@ -515,8 +515,9 @@ struct DocumentWalk::Scan {
 };
 
 DocumentWalk::DocumentWalk(const Path& path, Types types, const CompanyRecord& company,
-                           std::optional<Date> from, std::optional<Date> to)
-    : scan_(std::make_unique<Scan>(path, company)), types_(types) {
+                           std::optional<Date> from, std::optional<Date> to, int64_t start)
+    : scan_(std::make_unique<Scan>(path, company)), types_(types),
+      position_(std::max<int64_t>(start, 1)) {
     scan_->scan.prepareWalk(path, from, to);
     double exact = static_cast<double>(scan_->file.length()) / kDocRecordLength;
     records_ = static_cast<int64_t>(std::nearbyint(exact));

@@ -77,9 +77,11 @@ public:
     using Types = std::bitset<256>;
 
     // Opens the document file at path (an error when it cannot be opened).
-    // Only documents dated from `from` to `to` (when given) are taken.
+    // Only documents dated from `from` to `to` (when given) are taken, and
+    // only headers from record `start` on.
     DocumentWalk(const Path& path, Types types, const CompanyRecord& company,
-                 std::optional<Date> from = std::nullopt, std::optional<Date> to = std::nullopt);
+                 std::optional<Date> from = std::nullopt, std::optional<Date> to = std::nullopt,
+                 int64_t start = 2);
     ~DocumentWalk();
     DocumentWalk(const DocumentWalk&) = delete;
     DocumentWalk& operator=(const DocumentWalk&) = delete;

@@ -65,9 +65,10 @@ TEST_F(PrintCommandTest, SeveralPagesGoIntoAFolderNamedByReference) {
     for (const auto& entry : fs::directory_iterator(folder))
         names.push_back(entry.path().filename().string());
     std::sort(names.begin(), names.end());
-    EXPECT_EQ(names, (std::vector<std::string>{"7_1-2.htm", "7_1.htm", "8.htm", "document.htm"}));
+    EXPECT_EQ(names, (std::vector<std::string>{"20-7_1-2.htm", "20-7_1.htm", "20-8.htm",
+                                               "20-document.htm"}));
     EXPECT_NE(result.err.find("4 pages written"), std::string::npos);
-    EXPECT_NE(ReadAll(folder / "8.htm").find("<TD colspan='3' align='left' class=TD1>E</TD>"),
+    EXPECT_NE(ReadAll(folder / "20-8.htm").find("<TD colspan='3' align='left' class=TD1>E</TD>"),
               std::string::npos);
 }
 
@@ -86,9 +87,9 @@ TEST_F(PrintCommandTest, BadRequestsAreToldPlainly) {
                    (temp.path() / "missing" / "p.htm").string()},
                   "Cannot write the page");
 
-    EXPECT_EQ(PrintCommand::PageName(" a/b c "), "a_b_c");
-    EXPECT_EQ(PrintCommand::PageName("\xE0\xE1"), "__");
-    EXPECT_EQ(PrintCommand::PageName("   "), "document");
+    EXPECT_EQ(PrintCommand::PageName(20, " a/b c "), "20-a_b c");
+    EXPECT_EQ(PrintCommand::PageName(1, ".\x01אב"), "1-__אב");
+    EXPECT_EQ(PrintCommand::PageName(7, "   "), "7-document");
     EXPECT_EQ(PrintCommand::ParseDay("2024-02-29").day, 29);
     EXPECT_THROW(PrintCommand::ParseDay("2024-2-29"), Error);
 }
