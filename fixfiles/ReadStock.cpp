@@ -138,6 +138,7 @@ private:
     double factor_ = 1;
     double foreignSum_ = 0;
     std::optional<Document> found_;
+    std::optional<Document> company_; // only its company title and currency names
 };
 
 const std::string& StockScan::searchText() {
@@ -448,7 +449,11 @@ void StockScan::accept(const Record& header, const Record& cont, const Date& dat
     totals.withVat = Checked(DoubleAt(c, 120));
     totals.foreign = std::fabs(doc.discountPercent) >= 0.01 ? foreignSum_ * factor_ : foreignSum_;
     doc.lines = std::move(lines_);
-    TakeCompany(doc, ctx_.company);
+    // The company's texts are the same for every document of a walk.
+    if (!company_)
+        TakeCompany(company_.emplace(), ctx_.company);
+    doc.companyTitle = company_->companyTitle;
+    doc.currencyNames = company_->currencyNames;
 
     StoreHeader(ctx_.doc.header, doc);
     view_.PubPrevLocation = view_.PubACTLocation;
