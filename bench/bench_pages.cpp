@@ -45,7 +45,7 @@ std::string WriteCompany() {
                           {"address2", "נתניה"},
                           {"remarks", {"הערה ראשונה", "שנייה", ""}},
                           {"lines", lines}};
-    std::string dir = PrivatePageDir() + "/bench-company";
+    std::string dir = PrivatePageDir().native() + "/bench-company";
     sample::WriteCompany(nlohmann::json{{"documents", {doc}}}.dump(), dir);
     return dir;
 }
@@ -58,7 +58,7 @@ std::string PageFolder() {
     if (std::filesystem::is_directory("/dev/shm") &&
         (std::filesystem::create_directory(folder) || std::filesystem::is_directory(folder)))
         return folder;
-    return PrivatePageDir();
+    return PrivatePageDir().native();
 }
 
 void RegisterPages() {
