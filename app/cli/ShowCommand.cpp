@@ -2,7 +2,6 @@
 
 #include "app/cli/CompanyDir.h"
 #include "app/cli/ExitCode.h"
-#include "app/session/StateJson.h"
 #include "app/export/ExportRecord.h"
 #include "app/export/ItemCategories.h"
 #include "fixfiles/DateSerial.h"
