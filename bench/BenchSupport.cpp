@@ -126,13 +126,13 @@ int32_t BenchCard::read(const std::string& compPath, int16_t row, const std::str
     int16_t wizFile = row;
     std::string start = direction;
     std::string from = fromDate;
-    return card_->ReadStock(FromUtf8(compPath), wizFile, card_->PubSearchBy, card_->PubSearchValue,
-                            start, from);
+    return card_->ReadStock(FromUtf8(Utf8(compPath)), wizFile, card_->PubSearchBy,
+                            card_->PubSearchValue, start, from);
 }
 
 void BenchCard::search(const std::string& by, const std::string& utf8Value) {
     card_->PubSearchBy = by;
-    card_->PubSearchValue = Variant(FromUtf8(utf8Value));
+    card_->PubSearchValue = Variant(FromUtf8(Utf8(utf8Value)));
 }
 
 uint64_t PlainBlockRead(const std::string& path, size_t recordLength) {

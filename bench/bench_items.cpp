@@ -55,7 +55,7 @@ void RegisterItems() {
     Register("ReadITM/Items200k/40Lines", [](benchmark::State& state) {
         BenchCard bench;
         FillDocument(bench.card().shared().Doc);
-        std::string compPath = FromUtf8(Data().big);
+        std::string compPath = FromUtf8(Utf8(Data().big));
         for (auto _ : state)
             bench.card().ReadITM(compPath);
         if (!AllFound(bench.card().shared().Doc))

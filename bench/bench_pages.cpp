@@ -63,7 +63,7 @@ std::string PageFolder() {
 
 void RegisterPages() {
     static const std::string company = WriteCompany();
-    static const std::string page = FromUtf8(PageFolder() + "/bench-page.htm");
+    static const std::string page = FromUtf8(Utf8(PageFolder() + "/bench-page.htm"));
     auto show = [](BenchCard& bench) {
         Card& card = bench.card();
         card.UserControl_InitProperties(nullptr);
@@ -71,7 +71,7 @@ void RegisterPages() {
         card.chkLineDisc.setValue(1);
         int16_t type = 20;
         int32_t start = 2;
-        card.ShowDoc(FromUtf8(company), type, start);
+        card.ShowDoc(FromUtf8(Utf8(company)), type, start);
         return card.DocLines.Rows() == kLines + 2 && bench.messages() == 0;
     };
     Register("Page/Hebrew40Lines", [show](benchmark::State& state) {

@@ -45,7 +45,7 @@ public:
         dir_ = std::filesystem::temp_directory_path() /
                ("dovrel-bench-pictures-" + std::to_string(std::random_device()()));
         std::filesystem::create_directories(dir_);
-        dbName_ = FromUtf8((dir_ / PictureDb::kFileName).string());
+        dbName_ = FromUtf8(Utf8((dir_ / PictureDb::kFileName).string()));
         PictureDb db(dbName_);
         db.create(false);
         db.replaceAll(Ranges());

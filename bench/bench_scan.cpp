@@ -74,7 +74,7 @@ std::shared_ptr<Walker> CustomerWalk(const std::string& dir, const std::string& 
 std::shared_ptr<Walker> ItemKeyWalk(const std::string& dir, const std::string& direction) {
     auto walker = std::make_shared<Walker>(dir, kInvoiceRow, direction);
     walker->bench().search("ItemKey", kNoItem);
-    walker->bench().card().txtItemKey.setText(FromUtf8(kNoItem));
+    walker->bench().card().txtItemKey.setText(FromUtf8(Utf8(kNoItem)));
     return walker;
 }
 

@@ -161,7 +161,7 @@ void Card::PrintButt_Click() {
         if (WritePage(path))
             services_.browser.Open(path);
     } catch (const std::exception& e) {
-        ShowFailure(services_.messages, "תקלה", e);
+        ShowFailure(services_.messages, Utf8("תקלה"), e);
     }
 }
 

@@ -41,7 +41,7 @@ ControlDesign Command(const char* name, const char* captionUtf8, const char* tip
                       const char* picture, int32_t left, int32_t top, int32_t width,
                       int32_t height) {
     ControlDesign d = Design(name, Kind::Button, captionUtf8, left, top, width, height);
-    d.toolTip = FromUtf8(tipUtf8);
+    d.toolTip = FromUtf8(Utf8(tipUtf8));
     d.picture = picture;
     return d;
 }
@@ -54,7 +54,7 @@ ControlDesign Check(const char* name, const char* captionUtf8, int32_t left, int
 std::vector<std::string> Entries(std::initializer_list<const char*> utf8) {
     std::vector<std::string> entries;
     for (const char* entry : utf8)
-        entries.push_back(FromUtf8(entry));
+        entries.push_back(FromUtf8(Utf8(entry)));
     return entries;
 }
 

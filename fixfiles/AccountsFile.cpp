@@ -66,7 +66,7 @@ void AddAccount(AccountsTable& table, const unsigned char* record) {
 }
 
 AccountEntry NoAccount() {
-    std::string empty = FromUtf8("ריק");
+    std::string empty = FromUtf8(Utf8("ריק"));
     return AccountEntry{"", empty, empty, empty};
 }
 

@@ -51,7 +51,7 @@ void InitDocTypes(DocTypeTable& docTypes, DocFileTable& docFiles) {
     docTypes = {};
     for (int row = 0; row < kFilledDocTypes; ++row) {
         const DocTypeSource& source = kDocTypeSources[row];
-        docTypes[row] = {source.code, FromUtf8(source.hebrewTitle),
+        docTypes[row] = {source.code, FromUtf8(Utf8(source.hebrewTitle)),
                          std::string(source.englishTitle), source.fileNumber};
     }
 }

@@ -15,9 +15,9 @@ namespace {
 // spaces that give the column its initial width.
 const std::string& DocLinesFormat() {
     static const std::string format =
-        FromUtf8("<שורה|<פריט" + std::string(20, ' ') + "|<תאור" + std::string(70, ' ') +
-                 "|<פרטים" + std::string(40, ' ') + "|<כמות" + std::string(10, ' ') + "|<מחיר" +
-                 std::string(20, ' ') + "|<מטבע|<סהכ שח" + std::string(20, ' '));
+        FromUtf8(Utf8("<שורה|<פריט" + std::string(20, ' ') + "|<תאור" + std::string(70, ' ') +
+                      "|<פרטים" + std::string(40, ' ') + "|<כמות" + std::string(10, ' ') +
+                      "|<מחיר" + std::string(20, ' ') + "|<מטבע|<סהכ שח" + std::string(20, ' ')));
     return format;
 }
 

@@ -305,7 +305,7 @@ Walk StockScan::planWalk(const std::string& direction, int64_t records) {
         view_.PubACTLocation = static_cast<int32_t>(records);
         return {records, 2, -1};
     }
-    throw Error("Unknown direction \"" + ToUtf8(direction) + "\"");
+    throw Error("Unknown direction \"" + ToUtf8(direction).str() + "\"");
 }
 
 StockScan::Candidate StockScan::tryDocument(RecordFile& file, const unsigned char* headerRec,
@@ -470,7 +470,7 @@ StockRead WalkStock(DocumentView& view, const StockContext& context, const Path&
         return scan.run(pCompPath, pWizFile, pStartFrom, pFromDate);
     } catch (const std::exception& e) {
         StockRead failed = Ended(StockRead::Outcome::Failed);
-        failed.error = e.what();
+        failed.error = ErrorText(e);
         return failed;
     }
 }
@@ -488,13 +488,12 @@ int32_t ReadStock(DocumentView& view, const StockContext& context, const Path& p
         view.showNothing();
         break;
     case StockRead::Outcome::FileMissing:
-        context.messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("שגיאה"),
-                              FromUtf8("קבצי מסמכים לא נמצאו"));
+        context.messages.show(MsgIcon::Critical, MsgButtons::Ok, Utf8("שגיאה"),
+                              Utf8("קבצי מסמכים לא נמצאו"));
         return 0;
     case StockRead::Outcome::Failed:
         view.ProgressFill.setWidth(0);
-        context.messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("שגיאה"),
-                              FromUtf8(read.error));
+        context.messages.show(MsgIcon::Critical, MsgButtons::Ok, Utf8("שגיאה"), read.error);
         return 0;
     }
     view.ProgressFill.setWidth(0);

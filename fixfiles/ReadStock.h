@@ -36,7 +36,7 @@ struct StockRead {
     // last line record); 0 when the file is missing or the read failed.
     int32_t stoppedAt = 0;
     std::optional<Document> document; // when found
-    std::string error;                // when failed: the description, UTF-8
+    Utf8 error;                       // when failed: the description
 };
 
 // Finds the next document of the type in row pWizFile of the document-type

@@ -13,7 +13,7 @@
 namespace dovrel {
 
 RecordFile::RecordFile(const Path& path, size_t recordLength, size_t blockSize)
-    : path_(path.shown()), recordLength_(recordLength),
+    : path_(path.shown().str()), recordLength_(recordLength),
       lastNumber_(std::numeric_limits<int64_t>::max() /
                   std::max<int64_t>(1, static_cast<int64_t>(recordLength))),
       blocks_{{std::vector<unsigned char>(std::max(blockSize, recordLength))},

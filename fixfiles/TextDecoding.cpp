@@ -125,7 +125,7 @@ const std::array<CurrencyPair, 22>& FixedCurrencies() {
     static const std::array<CurrencyPair, 22> table = [] {
         std::array<CurrencyPair, 22> t;
         auto set = [&t](int code, std::string_view hebrew, std::string_view printed) {
-            t[code] = {FromUtf8(hebrew), FromUtf8(printed)};
+            t[code] = {FromUtf8(Utf8(hebrew)), FromUtf8(Utf8(printed))};
         };
         set(1, "$", "$");
         set(2, "לש", "£");

@@ -62,8 +62,8 @@ void AccDetailsForm::cmdCopyText_Click(int16_t Index) {
     if (text.empty())
         text = box.Text();
     if (text.empty()) {
-        host_->formMessages().show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("שגיאה"),
-                                   FromUtf8("לא נמצא טקסט להעתקה"));
+        host_->formMessages().show(MsgIcon::Critical, MsgButtons::Ok, Utf8("שגיאה"),
+                                   Utf8("לא נמצא טקסט להעתקה"));
         return;
     }
     // A clipboard that another program holds must not keep the window open.

@@ -28,7 +28,7 @@ const std::array<char32_t, 256>& CodePoints() {
     static const std::array<char32_t, 256> points = [] {
         std::array<char32_t, 256> table{};
         for (int b = 0; b < 256; ++b) {
-            std::string utf8 = ToUtf8(std::string(1, static_cast<char>(b)));
+            std::string utf8 = ToUtf8(std::string(1, static_cast<char>(b))).str();
             UChar32 cp = icu::UnicodeString::fromUTF8(utf8).char32At(0);
             table[static_cast<size_t>(b)] =
                 cp == 0xFFFD ? static_cast<char32_t>(b) : static_cast<char32_t>(cp);
@@ -187,9 +187,9 @@ std::vector<CompanyEntry> FindCompanies(const std::string& root) {
     fs::path nativeMain = ResolvePath(PathFromCp1255(main)).native();
     std::vector<CompanyEntry> table;
     for (const std::string& native : Subdirectories(main)) {
-        std::string name = FromUtf8(native);
+        std::string name = FromUtf8(Utf8(native));
         // A directory the core's code page cannot name could not be opened.
-        if (ToUtf8(name) != native)
+        if (ToUtf8(name).str() != native)
             continue;
         fs::path file = CompanyFileIn(nativeMain / native);
         if (file.empty())

@@ -95,7 +95,7 @@ void OpenDirForm::PathDrive_Change() {
         try {
             MainDir.setPath(drive);
         } catch (const std::exception& e) {
-            showError("תקלה", FromUtf8(e.what()));
+            showFailure(e);
         }
     }
     cmbCompany.Clear();
@@ -105,19 +105,19 @@ void OpenDirForm::PathDrive_Change() {
 void OpenDirForm::MainDir_Change() {
     cmbCompany.Clear();
     listed_.clear();
-    Msg1.setCaption(FromUtf8(kScanHint));
+    Msg1.setCaption(FromUtf8(Utf8(kScanHint)));
 }
 
 void OpenDirForm::cmdFindWizComp_Click() {
     requireShown("cmdFindWizComp");
-    Msg1.setCaption(FromUtf8(kScanning));
+    Msg1.setCaption(FromUtf8(Utf8(kScanning)));
     repaint();
     if (!MainDir.Path().empty()) {
         cmbCompany.setEnabled(false);
         FindWizPaths(MainDir.Path());
         cmbCompany.setEnabled(true);
     }
-    Msg1.setCaption(FromUtf8(kScanDone));
+    Msg1.setCaption(FromUtf8(Utf8(kScanDone)));
 }
 
 void OpenDirForm::FindWizPaths(const std::string& root) {
@@ -127,7 +127,7 @@ void OpenDirForm::FindWizPaths(const std::string& root) {
     try {
         companies_ = FindCompanies(root);
     } catch (const std::exception& e) {
-        showError("תקלה", FromUtf8(e.what()));
+        showFailure(e);
         return;
     }
     for (size_t i = 0; i < companies_.size(); ++i) {
@@ -143,7 +143,7 @@ void OpenDirForm::OKButton_Click() {
     requireShown("OKButton");
     int32_t index = cmbCompany.ListIndex();
     if (index < 0 || static_cast<size_t>(index) >= listed_.size()) {
-        showError("שגיאה", FromUtf8("לא בחרת חברה"));
+        showError("שגיאה", Utf8("לא בחרת חברה"));
         return;
     }
     compDir_ = companies_[listed_[static_cast<size_t>(index)]].path;
@@ -157,10 +157,14 @@ void OpenDirForm::CancelButton_Click() {
     Hide();
 }
 
-void OpenDirForm::showError(const char* titleUtf8, const std::string& text) {
+void OpenDirForm::showError(const char* titleUtf8, const Utf8& text) {
     if (!Visible())
-        throw Error(ToUtf8(text));
-    host_->formMessages().show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8(titleUtf8), text);
+        throw Error(text.str());
+    host_->formMessages().show(MsgIcon::Critical, MsgButtons::Ok, Utf8(titleUtf8), text);
+}
+
+void OpenDirForm::showFailure(const std::exception& failure) {
+    showError("תקלה", ErrorText(failure));
 }
 
 } // namespace dovrel

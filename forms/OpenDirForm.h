@@ -3,9 +3,11 @@
 #include "forms/Companies.h"
 #include "platform/Connection.h"
 #include "platform/Controls.h"
+#include "platform/Encoding.h"
 #include "platform/Form.h"
 #include "platform/ListControls.h"
 
+#include <exception>
 #include <string>
 #include <vector>
 
@@ -63,7 +65,8 @@ public:
     Button OKButton{"OKButton"};
 
 private:
-    void showError(const char* titleUtf8, const std::string& text);
+    void showError(const char* titleUtf8, const Utf8& text);
+    void showFailure(const std::exception& failure);
     void requireShown(const std::string& control) const;
     void reset();
 

@@ -30,14 +30,15 @@ Path PrivatePageDir() {
     std::string base = tmp != nullptr && tmp[0] == '/' ? tmp : "/tmp";
     std::string dir = base + "/dovrel-" + std::to_string(::getuid());
     if (::mkdir(dir.c_str(), 0700) != 0 && errno != EEXIST)
-        throw Error("Could not make the page folder " + Path(dir).shown() + ": " + Cause());
+        throw Error("Could not make the page folder " + Path(dir).shown().str() + ": " + Cause());
     struct stat st {};
     if (::lstat(dir.c_str(), &st) != 0)
-        throw Error("Could not use the page folder " + Path(dir).shown() + ": " + Cause());
+        throw Error("Could not use the page folder " + Path(dir).shown().str() + ": " + Cause());
     if (!S_ISDIR(st.st_mode) || st.st_uid != ::getuid())
-        throw Error("The page folder " + Path(dir).shown() + " is not a folder of this user's own");
+        throw Error("The page folder " + Path(dir).shown().str() +
+                    " is not a folder of this user's own");
     if ((st.st_mode & 077) != 0 && ::chmod(dir.c_str(), 0700) != 0)
-        throw Error("The page folder " + Path(dir).shown() + " is open to other users");
+        throw Error("The page folder " + Path(dir).shown().str() + " is open to other users");
     return Path(dir);
 }
 

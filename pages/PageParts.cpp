@@ -40,7 +40,7 @@ std::string JoinDate(int year, int month, int day, bool monthFirst, char separat
 std::string H(const char* utf8) {
     // A handful of short words a page, each a table lookup a character:
     // converting them as they come costs less than keeping them.
-    return FromUtf8(utf8);
+    return FromUtf8(Utf8(utf8));
 }
 
 void WriteHead(PageFile& page) {

@@ -43,7 +43,7 @@ std::string RangesFormat() {
     for (const auto& [heading, spaces] : columns) {
         if (!format.empty())
             format += '|';
-        format += FromUtf8(heading) + std::string(spaces, ' ');
+        format += FromUtf8(Utf8(heading)) + std::string(spaces, ' ');
     }
     return format;
 }
@@ -95,12 +95,12 @@ Messages& ItemPicsForm::messages() const {
 }
 
 void ItemPicsForm::showFailure(const std::exception& failure) const {
-    messages().show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("תקלה"), FromUtf8(failure.what()));
+    ShowFailure(messages(), Utf8("תקלה"), failure);
 }
 
 bool ItemPicsForm::confirm(const char* questionUtf8) const {
-    return messages().show(MsgIcon::Question, MsgButtons::YesNo, FromUtf8("שימו לב"),
-                           FromUtf8(questionUtf8)) == MsgAnswer::Yes;
+    return messages().show(MsgIcon::Question, MsgButtons::YesNo, Utf8("שימו לב"),
+                           Utf8(questionUtf8)) == MsgAnswer::Yes;
 }
 
 std::string ItemPicsForm::settingDbName() const {
@@ -139,7 +139,7 @@ int16_t ItemPicsForm::FillGridLines(const std::string& pDbName) {
         return 0;
     std::vector<PictureRange> ranges = PictureDb(pDbName).rangesById();
     if (ranges.size() > static_cast<size_t>(INT16_MAX))
-        throw Error("The picture database " + ToUtf8(pDbName) + " holds " +
+        throw Error("The picture database " + ToUtf8(pDbName).str() + " holds " +
                     std::to_string(ranges.size()) + " ranges, more than the list can show");
     int16_t count = 0;
     for (const PictureRange& range : ranges) {
@@ -164,15 +164,15 @@ int32_t ItemPicsForm::RowRangeID(int32_t row) const {
 void ItemPicsForm::SetGetMoreParams(uint8_t Action) {
     for (const Setting& setting : kSettings)
         BindSetting(host().settingsStore(), Action, host().settingsName(), "Params", setting.key,
-                    this->*setting.box, 1, Variant(FromUtf8(setting.defaultUtf8)));
+                    this->*setting.box, 1, Variant(FromUtf8(Utf8(setting.defaultUtf8))));
 }
 
 bool ItemPicsForm::CheckDBFile() {
     if (FileExists(PathFromCp1255(settingDbName())))
         return true;
     databaseMissing(settingDbName());
-    messages().show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("שגיאה"),
-                    FromUtf8("קובץ ההגדרות אינו נמצא"));
+    messages().show(MsgIcon::Critical, MsgButtons::Ok, Utf8("שגיאה"),
+                    Utf8("קובץ ההגדרות אינו נמצא"));
     return false;
 }
 
@@ -187,7 +187,7 @@ void ItemPicsForm::Click(const std::string& name) {
     if (auto it = handlers.find(name); it != handlers.end())
         (this->*it->second)();
     else if (findControl(name) == nullptr)
-        throw Error("The form frmItemPics has no control " + ToUtf8(name));
+        throw Error("The form frmItemPics has no control " + ToUtf8(name).str());
 }
 
 void ItemPicsForm::cmdSaveDef_Click() {
@@ -201,7 +201,7 @@ void ItemPicsForm::CmdNew_Click() {
     // Appended rather than added to a literal: g++ 12 warns wrongly on
     // "literal" + std::string at -O2.
     std::string row = "\t";
-    row += FromUtf8("תתתתתתתתתתתת");
+    row += FromUtf8(Utf8("תתתתתתתתתתתת"));
     row += "\t\t999\tpic001.jpg";
     ItemPicLines.AddItem(std::move(row));
     rangeIds_.resize(static_cast<size_t>(ItemPicLines.Rows()), 0);
@@ -275,11 +275,11 @@ void ItemPicsForm::CmdInitDB_Click() {
     try {
         PictureDb::Inspection old = PictureDb(dbName).inspect();
         if (old.kind == PictureDb::FileKind::Foreign) {
-            std::string question =
-                FromUtf8("הקובץ ") + dbName + FromUtf8(" אינו בסיס נתונים של תמונות (") +
-                FromUtf8(old.reason) + FromUtf8("). להחליף אותו בבסיס נתונים ריק?");
-            if (messages().show(MsgIcon::Question, MsgButtons::YesNo, FromUtf8("שימו לב"),
-                                question) != MsgAnswer::Yes)
+            Utf8 question = Utf8("הקובץ ") + ToUtf8(dbName) +
+                            Utf8(" אינו בסיס נתונים של תמונות (") + Utf8(old.reason) +
+                            Utf8("). להחליף אותו בבסיס נתונים ריק?");
+            if (messages().show(MsgIcon::Question, MsgButtons::YesNo, Utf8("שימו לב"), question) !=
+                MsgAnswer::Yes)
                 return;
             replaceForeign = true;
         }
@@ -288,8 +288,8 @@ void ItemPicsForm::CmdInitDB_Click() {
         return;
     }
     if (!CreatePicDB(dbName, messages(), replaceForeign).empty())
-        messages().show(MsgIcon::Information, MsgButtons::Ok, FromUtf8("הודעה"),
-                        FromUtf8("בסיס הנתונים אותחל"));
+        messages().show(MsgIcon::Information, MsgButtons::Ok, Utf8("הודעה"),
+                        Utf8("בסיס הנתונים אותחל"));
 }
 
 void ItemPicsForm::cmdClose_Click() {

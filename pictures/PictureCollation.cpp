@@ -68,7 +68,7 @@ const PictureCollation& PictureCollation::instance() {
 }
 
 int PictureCollation::compare(std::string_view a, std::string_view b) const {
-    return compareUtf8(ToUtf8(a), ToUtf8(b));
+    return compareUtf8(ToUtf8(a).str(), ToUtf8(b).str());
 }
 
 int PictureCollation::compareUtf8(std::string_view a, std::string_view b) const {
@@ -81,7 +81,7 @@ int PictureCollation::compareUtf8(std::string_view a, std::string_view b) const 
 }
 
 std::string PictureCollation::sortKey(std::string_view text) const {
-    std::u16string wide = ToUtf16(ToUtf8(text));
+    std::u16string wide = ToUtf16(ToUtf8(text).str());
     std::vector<uint8_t> key(wide.size() * 4 + 16);
     for (;;) {
         int32_t needed = ucol_getSortKey(collator_, wide.data(), static_cast<int32_t>(wide.size()),

@@ -101,7 +101,7 @@ std::string SchemaProblem(Connection& db) {
 std::string Damage(Connection& db) {
     Statement check(db, "PRAGMA quick_check(1)");
     std::string result = check.step() ? check.text(0).value_or("") : "";
-    return result == "ok" ? "" : "it is damaged (" + ToUtf8(result) + ")";
+    return result == "ok" ? "" : "it is damaged (" + ToUtf8(result).str() + ")";
 }
 
 PictureRange RangeAt(const Statement& row) {
@@ -250,12 +250,12 @@ void PictureDb::replaceAll(const std::vector<PictureRange>& ranges) const {
     const char* doing = "Cannot save the picture ranges to";
     for (size_t i = 0; i < ranges.size(); ++i)
         if (std::string problem = problemOf(ranges[i]); !problem.empty())
-            throw Error(std::string(doing) + " " + ResolvePath(PathFromCp1255(path_)).shown() +
-                        ": row " + std::to_string(i + 1) + ": " + problem +
-                        "; nothing was changed");
+            throw Error(std::string(doing) + " " +
+                        ResolvePath(PathFromCp1255(path_)).shown().str() + ": row " +
+                        std::to_string(i + 1) + ": " + problem + "; nothing was changed");
     if (ranges.size() > kMaxRanges)
-        throw Error(std::string(doing) + " " + ResolvePath(PathFromCp1255(path_)).shown() + ": " +
-                    std::to_string(ranges.size()) + " ranges are more than the " +
+        throw Error(std::string(doing) + " " + ResolvePath(PathFromCp1255(path_)).shown().str() +
+                    ": " + std::to_string(ranges.size()) + " ranges are more than the " +
                     std::to_string(kMaxRanges) +
                     " the picture settings can list; nothing was changed");
     auto db = OpenPictures(path_, true, busyTimeout_, doing);
@@ -276,8 +276,8 @@ void PictureDb::replaceAll(const std::vector<PictureRange>& ranges) const {
 int32_t PictureDb::add(PictureRange range) const {
     const char* doing = "Cannot add a picture range to";
     if (std::string problem = problemOf(range); !problem.empty())
-        throw Error(std::string(doing) + " " + ResolvePath(PathFromCp1255(path_)).shown() + ": " +
-                    problem);
+        throw Error(std::string(doing) + " " + ResolvePath(PathFromCp1255(path_)).shown().str() +
+                    ": " + problem);
     auto db = OpenPictures(path_, true, busyTimeout_, doing);
     db->begin("BEGIN IMMEDIATE");
     Statement last(*db, "SELECT coalesce(max(RangeID), 0) FROM tItemPicture");
@@ -287,11 +287,11 @@ int32_t PictureDb::add(PictureRange range) const {
     Statement count(*db, "SELECT count(*) FROM tItemPicture");
     count.step();
     if (count.integer(0) >= static_cast<int64_t>(kMaxRanges))
-        throw Error(std::string(doing) + " " + ResolvePath(PathFromCp1255(path_)).shown() +
+        throw Error(std::string(doing) + " " + ResolvePath(PathFromCp1255(path_)).shown().str() +
                     ": it holds " + std::to_string(kMaxRanges) +
                     " ranges, the most the picture settings can list");
     if (highest >= INT32_MAX)
-        throw Error(std::string(doing) + " " + ResolvePath(PathFromCp1255(path_)).shown() +
+        throw Error(std::string(doing) + " " + ResolvePath(PathFromCp1255(path_)).shown().str() +
                     ": no range number is free");
     int32_t rangeId = static_cast<int32_t>(std::max<int64_t>(highest, 0) + 1);
     Statement insert(*db, kUpsert);
@@ -402,7 +402,7 @@ std::string CreatePicDB(const std::string& path, Messages& messages, bool replac
         PictureDb(path).create(replaceForeign);
         return path;
     } catch (const std::exception& e) {
-        messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("תקלה"), FromUtf8(e.what()));
+        ShowFailure(messages, Utf8("תקלה"), e);
         return "";
     }
 }

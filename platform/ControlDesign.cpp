@@ -9,7 +9,7 @@ ControlDesign Design(std::string name, ControlKind kind, const char* captionUtf8
     ControlDesign d;
     d.name = std::move(name);
     d.kind = kind;
-    d.caption = FromUtf8(captionUtf8);
+    d.caption = FromUtf8(Utf8(captionUtf8));
     d.left = left;
     d.top = top;
     d.width = width;

@@ -75,7 +75,7 @@ bool IsControl(UChar32 c) {
 
 } // namespace
 
-std::string ToUtf8(std::string_view cp1255) {
+Utf8 ToUtf8(std::string_view cp1255) {
     const Cp1255Table& table = Table();
     std::string out;
     out.reserve(cp1255.size() * 2);
@@ -86,7 +86,7 @@ std::string ToUtf8(std::string_view cp1255) {
         else
             AppendUtf8(out, table.toUnicode[b]);
     }
-    return out;
+    return Utf8(std::move(out));
 }
 
 std::string ToTerminal(std::string_view cp1255) {
@@ -102,7 +102,7 @@ std::string ToTerminal(std::string_view cp1255) {
     return out;
 }
 
-std::string ValidUtf8(std::string_view bytes) {
+Utf8 ValidUtf8(std::string_view bytes) {
     std::string out;
     out.reserve(bytes.size());
     const auto* s = reinterpret_cast<const uint8_t*>(bytes.data());
@@ -113,15 +113,15 @@ std::string ValidUtf8(std::string_view bytes) {
         U8_NEXT(s, i, length, c);
         AppendUtf8(out, c < 0 ? 0xFFFD : c);
     }
-    return out;
+    return Utf8(std::move(out));
 }
 
-std::string FromUtf8(std::string_view utf8) {
+std::string FromUtf8(const Utf8& utf8) {
     const Cp1255Table& table = Table();
     std::string out;
-    out.reserve(utf8.size());
-    const auto* s = reinterpret_cast<const uint8_t*>(utf8.data());
-    auto length = static_cast<int32_t>(utf8.size());
+    out.reserve(utf8.str().size());
+    const auto* s = reinterpret_cast<const uint8_t*>(utf8.str().data());
+    auto length = static_cast<int32_t>(utf8.str().size());
     int32_t i = 0;
     while (i < length) {
         UChar32 c = 0;

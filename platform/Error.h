@@ -1,5 +1,8 @@
 #pragma once
 
+#include "platform/Encoding.h"
+
+#include <exception>
 #include <stdexcept>
 #include <string>
 
@@ -12,6 +15,10 @@ class Error : public std::runtime_error {
 public:
     explicit Error(const std::string& description) : std::runtime_error(description) {}
 };
+
+// A failure's description for a person, as valid UTF-8: what every message
+// box and the terminal show of an error.
+Utf8 ErrorText(const std::exception& failure);
 
 // The description of errno after a failed system call on a file, as
 // "<what> <path>: <reason>".

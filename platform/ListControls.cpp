@@ -34,9 +34,9 @@ std::vector<std::string> ReadMountPoints(FILE* table) {
         if (kInternalTypes.count(entry.mnt_type) != 0)
             continue;
         std::string native = entry.mnt_dir;
-        std::string text = FromUtf8(native);
+        std::string text = FromUtf8(Utf8(native));
         // A mount point the core's code page cannot name could not be opened.
-        if (native.starts_with('/') && ToUtf8(text) == native)
+        if (native.starts_with('/') && ToUtf8(text).str() == native)
             points.insert(text);
     }
     points.erase("/");
@@ -59,14 +59,14 @@ void DriveListBox::setDrive(const std::string& drive) {
     for (int32_t i = 0; i < ListCount(); ++i)
         if (List(i) == drive)
             return setListIndex(i);
-    throw Error("Drive not found: " + ToUtf8(drive));
+    throw Error("Drive not found: " + ToUtf8(drive).str());
 }
 
 void DirListBox::setPath(const std::string& path) {
     std::error_code ec;
     if (path.empty() ||
         !std::filesystem::is_directory(ResolvePath(PathFromCp1255(path)).native(), ec))
-        throw Error("Path not found: " + ToUtf8(path));
+        throw Error("Path not found: " + ToUtf8(path).str());
     if (path == path_)
         return;
     path_ = path;

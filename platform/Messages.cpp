@@ -1,13 +1,13 @@
 #include "platform/Messages.h"
 
-#include "platform/Encoding.h"
+#include "platform/Error.h"
 
 #include <utility>
 
 namespace dovrel {
 
-MsgAnswer RecordedMessages::show(MsgIcon icon, MsgButtons buttons, const std::string& title,
-                                 const std::string& text) {
+MsgAnswer RecordedMessages::show(MsgIcon icon, MsgButtons buttons, const Utf8& title,
+                                 const Utf8& text) {
     shown_.push_back({icon, buttons, title, text});
     if (buttons == MsgButtons::Ok)
         return MsgAnswer::Ok;
@@ -18,8 +18,8 @@ MsgAnswer RecordedMessages::show(MsgIcon icon, MsgButtons buttons, const std::st
     return answer;
 }
 
-void ShowFailure(Messages& messages, const std::string& titleUtf8, const std::exception& failure) {
-    messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8(titleUtf8), FromUtf8(failure.what()));
+void ShowFailure(Messages& messages, const Utf8& title, const std::exception& failure) {
+    messages.show(MsgIcon::Critical, MsgButtons::Ok, title, ErrorText(failure));
 }
 
 std::vector<RecordedMessages::Shown> RecordedMessages::take() {

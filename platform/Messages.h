@@ -1,5 +1,7 @@
 #pragma once
 
+#include "platform/Encoding.h"
+
 #include <deque>
 #include <exception>
 #include <string>
@@ -11,17 +13,18 @@ enum class MsgIcon { Critical, Question, Information };
 enum class MsgButtons { Ok, YesNo };
 enum class MsgAnswer { Ok, Yes, No };
 
-// The modal message boxes of the control. Title and text are code page 1255.
+// The modal message boxes of the control. Title and text are UTF-8, as a
+// person reads them: the control turns its own code page 1255 texts with
+// ToUtf8 where it calls the box.
 class Messages {
 public:
     virtual ~Messages() = default;
-    virtual MsgAnswer show(MsgIcon icon, MsgButtons buttons, const std::string& title,
-                           const std::string& text) = 0;
+    virtual MsgAnswer show(MsgIcon icon, MsgButtons buttons, const Utf8& title,
+                           const Utf8& text) = 0;
 };
 
-// Shows a failure under the title: the failure's description is UTF-8 text
-// (as every error's), turned here, and only here, into the box's code page.
-void ShowFailure(Messages& messages, const std::string& titleUtf8, const std::exception& failure);
+// Shows a failure's description (ErrorText) under the title.
+void ShowFailure(Messages& messages, const Utf8& title, const std::exception& failure);
 
 // A message box that nobody sees: it records every message and answers
 // questions from a queue (an empty queue answers "No"). Tests and the
@@ -31,12 +34,11 @@ public:
     struct Shown {
         MsgIcon icon;
         MsgButtons buttons;
-        std::string title;
-        std::string text;
+        Utf8 title;
+        Utf8 text;
     };
 
-    MsgAnswer show(MsgIcon icon, MsgButtons buttons, const std::string& title,
-                   const std::string& text) override;
+    MsgAnswer show(MsgIcon icon, MsgButtons buttons, const Utf8& title, const Utf8& text) override;
 
     void queueAnswer(MsgAnswer answer) { answers_.push_back(answer); }
     const std::vector<Shown>& shown() const { return shown_; }

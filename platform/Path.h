@@ -1,5 +1,7 @@
 #pragma once
 
+#include "platform/Encoding.h"
+
 #include <string>
 #include <string_view>
 
@@ -19,7 +21,7 @@ public:
 
     // The name for people (messages, the terminal, JSON): UTF-8, with bytes
     // that are not UTF-8 shown as U+FFFD.
-    std::string shown() const;
+    Utf8 shown() const;
 
     // This path followed by a name of the control's kind (code page 1255,
     // usually "\NAME.FIX").

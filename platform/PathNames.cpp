@@ -23,8 +23,8 @@ bool LeadsTo(std::string_view text, std::string_view prefix) {
 } // namespace
 
 std::string PathNames::text(const Path& path) {
-    std::string cp1255 = FromUtf8(path.native());
-    if (ToUtf8(cp1255) == path.native())
+    std::string cp1255 = FromUtf8(Utf8(path.native()));
+    if (ToUtf8(cp1255).str() == path.native())
         return cp1255;
     std::erase_if(kept_, [&](const auto& entry) { return entry.first == cp1255; });
     if (kept_.size() == kMaxKept)

@@ -85,7 +85,7 @@ void SqliteStatement::bind(int index, const std::optional<std::string>& text) {
     if (!text) {
         rc = sqlite3_bind_null(stmt_, index);
     } else {
-        std::string utf8 = ToUtf8(*text);
+        std::string utf8 = ToUtf8(*text).str();
         rc = sqlite3_bind_text(stmt_, index, utf8.data(), static_cast<int>(utf8.size()),
                                SQLITE_TRANSIENT);
     }
@@ -114,7 +114,8 @@ std::optional<std::string> SqliteStatement::text(int column) const {
         return std::nullopt;
     const unsigned char* data = sqlite3_column_text(stmt_, column);
     int size = sqlite3_column_bytes(stmt_, column);
-    return FromUtf8({reinterpret_cast<const char*>(data), static_cast<size_t>(size)});
+    return FromUtf8(
+        Utf8(std::string_view(reinterpret_cast<const char*>(data), static_cast<size_t>(size))));
 }
 
 } // namespace dovrel

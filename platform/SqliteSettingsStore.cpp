@@ -47,7 +47,7 @@ SqliteStatement& Bind(SqliteStatement& statement, const Texts&... texts) {
 // Built by appending: g++ 12 at -O3 warns falsely about "..." + std::string.
 std::string Quoted(const std::string& cp1255) {
     std::string quoted = "\"";
-    quoted += ToUtf8(cp1255);
+    quoted += ToUtf8(cp1255).str();
     quoted += '"';
     return quoted;
 }

@@ -2,7 +2,8 @@
 
 namespace dovrel {
 
-std::string TerminalText(std::string_view utf8) {
+std::string TerminalText(const Utf8& text) {
+    std::string_view utf8 = text.view();
     const char* const replacement = "\xEF\xBF\xBD";
     std::string safe;
     safe.reserve(utf8.size());

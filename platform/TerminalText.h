@@ -1,7 +1,8 @@
 #pragma once
 
+#include "platform/Encoding.h"
+
 #include <string>
-#include <string_view>
 
 namespace dovrel {
 
@@ -9,6 +10,6 @@ namespace dovrel {
 // control (including TAB, LF and CR), DEL and every C1 control (U+0080 to
 // U+009F) becomes U+FFFD, so a text can neither move the cursor, send an
 // escape sequence nor end or split a line.
-std::string TerminalText(std::string_view utf8);
+std::string TerminalText(const Utf8& utf8);
 
 } // namespace dovrel

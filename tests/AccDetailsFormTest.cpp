@@ -69,7 +69,7 @@ TEST_F(AccDetailsFormTest, AnEmptyBoxSaysSoAndKeepsTheWindowOpen) {
         form.Click("cmdCopyText(0)");
         EXPECT_TRUE(form.Visible());
         ASSERT_EQ(messages.shown().size(), 1u);
-        EXPECT_EQ(U(messages.shown()[0].title + ": " + messages.shown()[0].text),
+        EXPECT_EQ(U(messages.shown()[0].title) + ": " + U(messages.shown()[0].text),
                   "שגיאה: לא נמצא טקסט להעתקה");
         form.txtDistrict.setText(""); // a box the user emptied
         form.cmdCopyText_Click(2);

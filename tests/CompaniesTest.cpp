@@ -78,7 +78,7 @@ TEST(CompaniesTest, ScanFindsTheCompanyDirectoriesJustBelowTheMainDirectory) {
     std::ofstream(root / "short" / "Adf.Fix", std::ios::binary) << "AB";
     std::ofstream(root / "ADF.FIX") << "not a company directory";
 
-    std::string base = FromUtf8(root.string());
+    std::string base = FromUtf8(Utf8(root.string()));
     std::vector<CompanyEntry> table = FindCompanies(base);
     ASSERT_EQ(table.size(), 5u);
     // Whole paths, however long, and names filled to 20 bytes.
@@ -128,12 +128,12 @@ TEST(CompaniesTest, TheDirectoryTreeShowsOnlyDirectoriesThatExist) {
     DirListBox tree("MainDir");
     int changes = 0;
     Connection watching = tree.changed.connect([&] { ++changes; });
-    tree.setPath(FromUtf8(dir.str()));
-    tree.setPath(FromUtf8(dir.str()));
+    tree.setPath(FromUtf8(Utf8(dir.str())));
+    tree.setPath(FromUtf8(Utf8(dir.str())));
     EXPECT_EQ(changes, 1);
     for (std::string bad : {std::string(), dir.str() + "/missing", dir.str() + "/file"})
-        EXPECT_THROW(tree.setPath(FromUtf8(bad)), Error) << bad;
-    EXPECT_EQ(tree.Path(), FromUtf8(dir.str()));
+        EXPECT_THROW(tree.setPath(FromUtf8(Utf8(bad))), Error) << bad;
+    EXPECT_EQ(tree.Path(), FromUtf8(Utf8(dir.str())));
 }
 
 } // namespace

@@ -237,7 +237,7 @@ Result ConcurrentWriterTest::scan(std::string direction, const Search& search) {
     card.PubPrevLocation = 0;
     int16_t row = kDeliveryRow;
     std::string fromDate = search.fromDate;
-    card.ReadStock(FromUtf8(dir.str()), row, card.PubSearchBy, card.PubSearchValue, direction,
+    card.ReadStock(FromUtf8(Utf8(dir.str())), row, card.PubSearchBy, card.PubSearchValue, direction,
                    fromDate);
     if (!messages.shown().empty()) {
         std::string text = U(messages.take().back().text);

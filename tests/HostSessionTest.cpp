@@ -103,11 +103,11 @@ TEST_F(HostSessionTest, TextCrossesTheJsonWithoutLoss) {
     std::string bytes;
     for (int b = 1; b < 256; ++b)
         bytes.push_back(static_cast<char>(b));
-    std::string text = ToUtf8(bytes);
+    std::string text = ToUtf8(bytes).str();
     ask({"set", "PubSearchValue", text});
     json back = ask({"get", "PubSearchValue"})["value"];
     EXPECT_EQ(back, text);
-    EXPECT_EQ(FromUtf8(back.get<std::string>()), bytes);
+    EXPECT_EQ(FromUtf8(Utf8(back.get<std::string>())), bytes);
     EXPECT_EQ(back.get<std::string>().find("\xEF\xBF\xBD"), std::string::npos) << "no U+FFFD";
 
     // A company folder whose name the code page cannot hold opens as it is named.
@@ -117,7 +117,7 @@ TEST_F(HostSessionTest, TextCrossesTheJsonWithoutLoss) {
     std::filesystem::copy(company.path(), folder);
     EXPECT_EQ(ask({"call", "ShowDoc", folder.string(), 20, 2})["result"], 0);
     EXPECT_EQ(ask({"get", "txtCustomerName"})["value"], "משה כהן");
-    EXPECT_EQ(ask({"get", "txtCompPath"})["value"], ToUtf8(FromUtf8(folder.string())));
+    EXPECT_EQ(ask({"get", "txtCompPath"})["value"], ToUtf8(FromUtf8(Utf8(folder.string()))).str());
 }
 
 TEST(CardMembersTest, ListsAndCheckBoxesTakeWholeNumbersInTheirRange) {
@@ -245,7 +245,7 @@ TEST_F(HostSessionTest, AnswersAndClipboard) {
     ask({"answers", {"yes", "no"}});
     RecordedMessages& box = session.messages();
     for (MsgAnswer answer : {MsgAnswer::Yes, MsgAnswer::No, MsgAnswer::No}) // "no" once used up
-        EXPECT_EQ(box.show(MsgIcon::Question, MsgButtons::YesNo, "t", "q"), answer);
+        EXPECT_EQ(box.show(MsgIcon::Question, MsgButtons::YesNo, Utf8("t"), Utf8("q")), answer);
     session.clipboard().SetText(test::W("טלפון 03"));
     EXPECT_EQ(ask({"clipboard"})["result"], "טלפון 03");
 }

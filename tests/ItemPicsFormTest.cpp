@@ -48,7 +48,7 @@ protected:
     }
 
     test::TempDir dir;
-    std::string dbDir = FromUtf8(dir.str() + "/");
+    std::string dbDir = FromUtf8(Utf8(dir.str() + "/"));
     PictureDb db{dbDir + "Dovrel.def"};
     std::unique_ptr<Card> card;
 };
@@ -221,7 +221,7 @@ TEST_F(ItemPicsFormTest, APrintedDemoDocumentWithDrawingsShowsTheLinePictures) {
     form.txtPicPath.setText("/pics/");
     int16_t type = 20;
     int32_t first = 2;
-    ASSERT_EQ(card->ShowDoc(FromUtf8(DOVREL_DEMO_DIR), type, first), 0);
+    ASSERT_EQ(card->ShowDoc(FromUtf8(Utf8(DOVREL_DEMO_DIR)), type, first), 0);
     card->ChkWithDrawing.setValue(1);
     for (int32_t language : {0, 1}) {
         card->CmbDocLang.setListIndex(language);

@@ -34,7 +34,7 @@ protected:
         card->UserControl_InitProperties(nullptr);
     }
     std::string dir(const std::string& name) const {
-        return FromUtf8((main.path() / name).string());
+        return FromUtf8(Utf8((main.path() / name).string()));
     }
     // Opens the chooser, goes to the main directory and scans it.
     void scanThen(const std::function<void(OpenDirForm&)>& then) {
@@ -42,7 +42,7 @@ protected:
             if (form.repaint.empty())
                 repainting = form.repaint.connect(
                     [&form, this] { statusWhileScanning = U(form.Msg1.Caption()); });
-            form.MainDir.setPath(FromUtf8(main.str()));
+            form.MainDir.setPath(FromUtf8(Utf8(main.str())));
             form.Click("cmdFindWizComp");
             then(form);
         };
@@ -78,7 +78,7 @@ TEST_F(OpenDirFormTest, ChoosingACompanySetsThePathAndFirstReadsFromIt) {
     EXPECT_EQ(state.CompDir, dir("comp03"));
     EXPECT_EQ(card->txtCompPath.Text(), dir("comp03"));
     EXPECT_EQ(chooser().companies().size(), 4u);
-    EXPECT_EQ(chooser().LastMainDir(), FromUtf8(main.str()));
+    EXPECT_EQ(chooser().LastMainDir(), FromUtf8(Utf8(main.str())));
     EXPECT_EQ(chooser().LastDrive(), "/");
     card->cmbDocType.setListIndex(13); // delivery notes
     card->Click("FirstButt");
@@ -122,7 +122,7 @@ TEST_F(OpenDirFormTest, CancelKeepsThePathAndTheListButResetsThePosition) {
     forms.user = [&](OpenDirForm& form) {
         EXPECT_EQ(form.cmbCompany.ListCount(), 0);
         EXPECT_EQ(form.PathDrive.Drive(), "/");
-        EXPECT_EQ(form.MainDir.Path(), FromUtf8(main.str()));
+        EXPECT_EQ(form.MainDir.Path(), FromUtf8(Utf8(main.str())));
     };
     card->Click("CmdDir");
     EXPECT_EQ(state.CompDir, dir("comp02"));
@@ -150,14 +150,14 @@ TEST(OpenDirFormLoadTest, ADriveThatIsNotThereLeavesTheFirstAndADriveChangeMoves
     ModuleState state;
     Card card(messages, state);
     TempDir other;
-    OpenDirForm form(card, {"/", FromUtf8(other.str()), "/no-such-mount"});
+    OpenDirForm form(card, {"/", FromUtf8(Utf8(other.str())), "/no-such-mount"});
     form.Load(); // the remembered drive is empty: "c:", which is not there
     EXPECT_EQ(form.PathDrive.Drive(), "/");
     EXPECT_EQ(form.MainDir.Path(), "/");
     EXPECT_EQ(form.Msg1.Caption(), "");
     form.cmbCompany.AddItem("x");
     form.PathDrive.setListIndex(1);
-    EXPECT_EQ(form.MainDir.Path(), FromUtf8(other.str()));
+    EXPECT_EQ(form.MainDir.Path(), FromUtf8(Utf8(other.str())));
     EXPECT_EQ(form.cmbCompany.ListCount(), 0);
     EXPECT_EQ(U(form.Msg1.Caption()), "לחץ על חפש חברות חשבשבת לאיתור החברות");
     // A drive that cannot be opened: an error while the form is hidden, a
@@ -166,7 +166,7 @@ TEST(OpenDirFormLoadTest, ADriveThatIsNotThereLeavesTheFirstAndADriveChangeMoves
     form.PathDrive.setListIndex(1);
     form.Show();
     form.PathDrive.setListIndex(2);
-    EXPECT_EQ(form.MainDir.Path(), FromUtf8(other.str()));
+    EXPECT_EQ(form.MainDir.Path(), FromUtf8(Utf8(other.str())));
     EXPECT_EQ(messages.shown().size(), 1u);
     EXPECT_EQ(U(messages.shown().at(0).title), "תקלה");
 }

@@ -370,7 +370,7 @@ TEST_F(PagesTest, PrintWritesThePrivatePageAndOpensItOrSaysWhatFailed) {
     EXPECT_EQ(U(messages.shown()[0].title), "תקלה");
     EXPECT_EQ(messages.shown()[0].icon, MsgIcon::Critical);
     EXPECT_EQ(messages.shown()[0].buttons, MsgButtons::Ok);
-    EXPECT_NE(messages.shown()[0].text.find("dvprint.htm"), std::string::npos);
+    EXPECT_NE(messages.shown()[0].text.str().find("dvprint.htm"), std::string::npos);
     fs::remove(page);
     EXPECT_EQ(std::distance(fs::directory_iterator(dir), fs::directory_iterator()), 0)
         << "no half-written page is left behind";

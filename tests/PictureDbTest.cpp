@@ -76,7 +76,7 @@ protected:
         }
         return shown;
     }
-    std::string dbName() const { return FromUtf8(file.string()); }
+    std::string dbName() const { return FromUtf8(Utf8(file.string())); }
     // Runs SQL on a plain connection, as another program would.
     void otherProgram(const char* sql) {
         sqlite3* raw = nullptr;
@@ -93,7 +93,7 @@ protected:
 
     test::TempDir dir;
     std::filesystem::path file = dir.path() / "Dovrel.def";
-    PictureDb db{FromUtf8(file.string())};
+    PictureDb db{FromUtf8(Utf8(file.string()))};
     PictureCache cache;
 };
 
@@ -244,12 +244,12 @@ TEST_F(PictureDbTest, ReCreatingReplacesTheFileOnlyWhenTheNewOneIsComplete) {
     expectKept(before);
     chmod(dir.path().c_str(), 0777);
 
-    PictureDb missingDir(FromUtf8((dir.path() / "no" / "Dovrel.def").string()));
+    PictureDb missingDir(FromUtf8(Utf8((dir.path() / "no" / "Dovrel.def").string())));
     RecordedMessages messages;
     EXPECT_EQ(CreatePicDB(missingDir.path(), messages), "");
     ASSERT_EQ(messages.shown().size(), 1u);
     EXPECT_EQ(U(messages.shown()[0].title), "תקלה");
-    EXPECT_THAT(messages.shown()[0].text, HasSubstr("Cannot create the picture database"));
+    EXPECT_THAT(messages.shown()[0].text.str(), HasSubstr("Cannot create the picture database"));
     EXPECT_EQ(CreatePicDB(db.path(), messages), db.path());
 }
 

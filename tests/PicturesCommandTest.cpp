@@ -109,7 +109,7 @@ TEST_F(PicturesCommandTest, TheFolderComesFromTheSettingsAndAForeignFileIsKept) 
     Result unset = run("list", {}, false);
     EXPECT_EQ(unset.code, 1);
     EXPECT_THAT(unset.err, HasSubstr("No picture folder is set"));
-    store.SaveSetting("Dovrel", "Params", "DBPath", FromUtf8(dir.str() + "/"));
+    store.SaveSetting("Dovrel", "Params", "DBPath", FromUtf8(Utf8(dir.str() + "/")));
     EXPECT_EQ(run("init", {}, false).code, 0);
     EXPECT_EQ(run("add", {"a", "b", "p.jpg"}, false).out, "Added range 1\n");
 

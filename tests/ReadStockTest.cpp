@@ -141,7 +141,7 @@ TEST_F(ReadStockTest, TheWalkYieldsTheDocumentOrWhyThereIsNone) {
               std::tuple(StockRead::Outcome::NotFound, 5, false));
     EXPECT_EQ(walk("First", 30).outcome, StockRead::Outcome::FileMissing); // a row without a file
     StockRead failed = walk("Sideways");
-    EXPECT_EQ(std::tuple(failed.outcome, failed.error),
+    EXPECT_EQ(std::tuple(failed.outcome, failed.error.str()),
               std::tuple(StockRead::Outcome::Failed, "Unknown direction \"Sideways\""));
     EXPECT_EQ(messages.shown().size(), 0u);
 

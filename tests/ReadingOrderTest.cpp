@@ -34,7 +34,7 @@ TEST(ReadingOrderTest, GivesBackEveryDemoTextAsTyped) {
     ASSERT_GT(texts.size(), 100u);
     for (const std::string& text : texts) {
         std::string stored = "  " + sample::DosVisual(text) + "   "; // padded as in a field
-        EXPECT_EQ(ToUtf8(ReadingOrderText(stored)), text)
+        EXPECT_EQ(ToUtf8(ReadingOrderText(stored)).str(), text)
             << "stored as " << sample::DosVisual(text);
     }
 }

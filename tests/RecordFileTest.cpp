@@ -81,7 +81,7 @@ TEST(FileSystemTest, ResolvesDosPathsWithoutRegardToCase) {
     fs::create_directories(dir.path() / "Comp02");
     std::ofstream(dir.path() / "Comp02" / "ITM.FIX") << "x";
     std::ofstream(dir.path() / "Comp02" / "adf.fix") << "x";
-    std::string base = FromUtf8(dir.str());
+    std::string base = FromUtf8(Utf8(dir.str()));
 
     // Hebrew names travel as code page 1255 in the core and UTF-8 on disk.
     fs::create_directories(dir.path() / "חברה");
@@ -91,7 +91,7 @@ TEST(FileSystemTest, ResolvesDosPathsWithoutRegardToCase) {
                                        {"\\COMP02", false},
                                        {"\\COMP02\\ACT.fix", false},
                                        {"\\חברה\\ISHP.FIX", true}})
-        EXPECT_EQ(FileExists(PathFromCp1255(base + FromUtf8(path))), exists) << path;
+        EXPECT_EQ(FileExists(PathFromCp1255(base + FromUtf8(Utf8(path)))), exists) << path;
     EXPECT_FALSE(FileExists(Path()));
     EXPECT_EQ(ResolvePath(PathFromCp1255(base + "\\nothing\\ITM.fix")).native(),
               dir.str() + "/nothing/ITM.fix");

@@ -72,7 +72,7 @@ public:
     }
     const std::filesystem::path& path() const { return dir_.path(); }
     // The company path as the control holds it (code page 1255).
-    std::string compPath() const { return FromUtf8(dir_.str()); }
+    std::string compPath() const { return FromUtf8(Utf8(dir_.str())); }
     std::filesystem::path file(const std::string& name) const { return dir_.path() / name; }
 
 private:
@@ -81,10 +81,13 @@ private:
 
 // UTF-8 literal to the core's code page 1255, and back.
 inline std::string W(std::string_view utf8) {
-    return FromUtf8(utf8);
+    return FromUtf8(Utf8(utf8));
 }
 inline std::string U(std::string_view cp1255) {
-    return ToUtf8(cp1255);
+    return ToUtf8(cp1255).str();
+}
+inline std::string U(const Utf8& text) {
+    return text.str();
 }
 
 inline std::string ReadAll(const std::filesystem::path& path) {

@@ -126,7 +126,8 @@ char DosByte(UChar32 c) {
     int32_t length = 0;
     UBool error = false;
     U8_APPEND(utf8, length, 4, c, error);
-    std::string cp = FromUtf8({reinterpret_cast<const char*>(utf8), static_cast<size_t>(length)});
+    std::string cp = FromUtf8(
+        Utf8(std::string_view(reinterpret_cast<const char*>(utf8), static_cast<size_t>(length))));
     if (error || cp.size() != 1 || cp == "?")
         throw Error("character " + HexCode(c) + " has no byte in code page 1255");
     auto b = static_cast<unsigned char>(cp[0]);

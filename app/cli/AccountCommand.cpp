@@ -16,7 +16,7 @@
 namespace dovrel {
 
 int AccountCommand::run(std::ostream& out) {
-    std::string key = TrimCopy(FromUtf8(options_.key));
+    std::string key = TrimCopy(FromUtf8(Utf8(options_.key)));
     if (key.empty())
         throw Error("Give the key of the account");
     // The scan's progress bar, which nobody sees here.
@@ -26,11 +26,11 @@ int AccountCommand::run(std::ostream& out) {
     CheckCompanyDir(compDir);
     AccountEntry account = FindAccountInFile(compDir, key, {frame, fill}, TextOrder::Reading);
     if (options_.json) {
-        nlohmann::json answer = {{"key", ToUtf8(key)},
+        nlohmann::json answer = {{"key", ToUtf8(key).str()},
                                  {"found", !account.Key.empty()},
-                                 {"phone", ToUtf8(account.Phone)},
-                                 {"details", ToUtf8(account.Details)},
-                                 {"district", ToUtf8(account.District)}};
+                                 {"phone", ToUtf8(account.Phone).str()},
+                                 {"details", ToUtf8(account.Details).str()},
+                                 {"district", ToUtf8(account.District).str()}};
         out << StateJson::Dump(answer, 2) << '\n';
     } else {
         out << "טלפונים: " << ToTerminal(account.Phone) << '\n'

@@ -5,6 +5,7 @@
 #include "forms/Companies.h"
 #include "platform/Encoding.h"
 #include "platform/Error.h"
+#include "platform/Path.h"
 #include "platform/TerminalText.h"
 
 #include <ostream>
@@ -16,8 +17,8 @@ namespace dovrel {
 int CompaniesCommand::run(std::ostream& out, std::ostream& err) {
     if (options_.mainDir.empty())
         throw Error("Give the main directory to scan");
-    std::string root = FromUtf8(options_.mainDir);
-    if (ToUtf8(root) != options_.mainDir)
+    std::string root = FromUtf8(Utf8(options_.mainDir));
+    if (ToUtf8(root).str() != options_.mainDir)
         throw Error("The main directory cannot be named in the Hebrew code page: " +
                     options_.mainDir);
     nlohmann::json list = nlohmann::json::array();
@@ -28,7 +29,7 @@ int CompaniesCommand::run(std::ostream& out, std::ostream& err) {
         const std::string& name = entry.readingName;
         ++listed;
         if (options_.json)
-            list.push_back({{"name", ToUtf8(name)}, {"path", ToUtf8(entry.path)}});
+            list.push_back({{"name", ToUtf8(name).str()}, {"path", ToUtf8(entry.path).str()}});
         else
             out << ToTerminal(name) << '\t' << ToTerminal(entry.path) << '\n';
     }
@@ -36,7 +37,7 @@ int CompaniesCommand::run(std::ostream& out, std::ostream& err) {
         out << StateJson::Dump(list, 2) << '\n';
     if (listed > 0)
         return kExitDone;
-    err << "No companies found in " << TerminalText(options_.mainDir) << '\n';
+    err << "No companies found in " << TerminalText(Path(options_.mainDir).shown()) << '\n';
     return kExitNotFound;
 }
 

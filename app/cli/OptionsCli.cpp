@@ -37,7 +37,7 @@ std::string TypeToCode(std::string& text) {
     bool number = ec == std::errc() && end == text.data() + text.size();
     for (const DocTypeRow& row : rows) {
         if ((number && row.code == code) || Folded(text) == Folded(row.englishTitle) ||
-            text == ToUtf8(row.hebrewTitle)) {
+            text == ToUtf8(row.hebrewTitle).str()) {
             text = std::to_string(row.code);
             return "";
         }
@@ -50,7 +50,7 @@ std::string TypeList() {
                        " The types:";
     for (const DocTypeRow& row : DocTypeRows())
         list += "\n  " + std::to_string(row.code) + "  " + row.englishTitle + "  " +
-                ToUtf8(row.hebrewTitle);
+                ToUtf8(row.hebrewTitle).str();
     return list;
 }
 

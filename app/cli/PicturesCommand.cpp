@@ -41,7 +41,7 @@ std::optional<std::string> NullWhenEmpty(const std::string& text) {
 PictureRange RangeOfCells(const std::vector<std::string>& utf8) {
     PictureRange range;
     for (size_t i = 0; i < 5; ++i)
-        range.*kMembers[i] = FromUtf8(utf8[i]);
+        range.*kMembers[i] = FromUtf8(Utf8(utf8[i]));
     range.FromItemKey = NullWhenEmpty(*range.FromItemKey);
     range.FromCatCode = NullWhenEmpty(*range.FromCatCode);
     return range;
@@ -52,7 +52,7 @@ PictureRange RangeOfCells(const std::vector<std::string>& utf8) {
 PictureRange RangeOfRecord(const std::vector<std::string>& utf8) {
     PictureRange range;
     for (size_t i = 0; i < 5; ++i)
-        range.*kMembers[i] = NullWhenEmpty(FromUtf8(utf8[i]));
+        range.*kMembers[i] = NullWhenEmpty(FromUtf8(Utf8(utf8[i])));
     return range;
 }
 
@@ -143,8 +143,8 @@ PicturesCommand::PicturesCommand(PicturesOptions options, SettingsStore& store)
 
 std::string PicturesCommand::dbName(std::ostream& err) {
     if (!options_.db.empty())
-        return JoinFolder(FromUtf8(options_.db), PictureDb::kFileName);
-    std::string dir = store_.GetSetting(FromUtf8(options_.app), "Params", "DBPath", "c:\\");
+        return JoinFolder(FromUtf8(Utf8(options_.db)), PictureDb::kFileName);
+    std::string dir = store_.GetSetting(FromUtf8(Utf8(options_.app)), "Params", "DBPath", "c:\\");
     if (dir.empty() || SettingsStore::FoldCase(dir) == "c:\\") {
         err << "No picture folder is set: give one with --db DIR, or save DBPath in the picture "
                "settings (dovrel settings set DBPath DIR/)\n";
@@ -162,7 +162,7 @@ int PicturesCommand::run(std::ostream& out, std::ostream& err) {
     if (action == "init")
         return init(db, out);
     if (action != "import" && !FileExists(PathFromCp1255(name))) {
-        err << "There is no picture database at " << ResolvePath(PathFromCp1255(name)).shown()
+        err << "There is no picture database at " << ResolvePath(PathFromCp1255(name)).shown().str()
             << " (dovrel pictures init makes one)\n";
         return 1;
     }
@@ -189,18 +189,19 @@ void PicturesCommand::needArgs(size_t count, const char* usage) const {
 int PicturesCommand::init(const PictureDb& db, std::ostream& out) {
     PictureDb::Inspection old = db.inspect();
     if (old.kind == PictureDb::FileKind::Foreign && !options_.force)
-        throw Error("The file " + ResolvePath(PathFromCp1255(db.path())).shown() +
+        throw Error("The file " + ResolvePath(PathFromCp1255(db.path())).shown().str() +
                     " is not a picture database (" + old.reason +
                     "); it was left as it is. Give --force to replace it");
     if (old.kind == PictureDb::FileKind::Pictures && !options_.force) {
         if (size_t held = db.rangesById().size(); held > 0)
-            throw Error("The picture database " + ResolvePath(PathFromCp1255(db.path())).shown() +
-                        " holds " + std::to_string(held) +
+            throw Error("The picture database " +
+                        ResolvePath(PathFromCp1255(db.path())).shown().str() + " holds " +
+                        std::to_string(held) +
                         " ranges; it was left as it is. Give --force to empty it");
     }
     db.create(options_.force);
-    out << "Created an empty picture database at " << ResolvePath(PathFromCp1255(db.path())).shown()
-        << '\n';
+    out << "Created an empty picture database at "
+        << ResolvePath(PathFromCp1255(db.path())).shown().str() << '\n';
     return 0;
 }
 
@@ -247,7 +248,7 @@ int PicturesCommand::remove(const PictureDb& db, std::ostream& err) const {
     int32_t rangeId = ParseRangeId(options_.args[0]);
     if (db.remove(rangeId))
         return 0;
-    err << "No range " << rangeId << " in " << ResolvePath(PathFromCp1255(db.path())).shown()
+    err << "No range " << rangeId << " in " << ResolvePath(PathFromCp1255(db.path())).shown().str()
         << '\n';
     return kExitNotFound;
 }
@@ -255,16 +256,16 @@ int PicturesCommand::remove(const PictureDb& db, std::ostream& err) const {
 // A line's category code is three characters, as stored.
 int PicturesCommand::which(const PictureDb& db, std::ostream& out, std::ostream& err) const {
     needArgs(2, "which ITEMKEY CATCODE");
-    std::string key = FromUtf8(options_.args[0]);
-    std::string code = FromUtf8(options_.args[1]).substr(0, PictureDb::kCodeSize);
+    std::string key = FromUtf8(Utf8(options_.args[0]));
+    std::string code = FromUtf8(Utf8(options_.args[1])).substr(0, PictureDb::kCodeSize);
     code.resize(PictureDb::kCodeSize, ' ');
     PictureLookup lookup(db.rangesInLookupOrder());
     if (const std::string* picture = lookup.pictureFor(key, code)) {
         out << ToTerminal(*picture) << '\n';
         return kExitDone;
     }
-    err << "No picture for item " << TerminalText(options_.args[0]) << " with category code \""
-        << TerminalText(options_.args[1]) << "\"\n";
+    err << "No picture for item " << TerminalText(ValidUtf8(options_.args[0]))
+        << " with category code \"" << TerminalText(ValidUtf8(options_.args[1])) << "\"\n";
     return kExitNotFound;
 }
 
@@ -274,7 +275,7 @@ int PicturesCommand::exportTo(const PictureDb& db, std::ostream& out) const {
     csv << "FromItemKey,ToItemKey,FromCatCode,ToCatCode,PicFile\r\n";
     for (const PictureRange& range : db.rangesById()) {
         for (size_t i = 0; i < 5; ++i)
-            csv << (i ? "," : "") << CsvField(ToUtf8((range.*kMembers[i]).value_or("")));
+            csv << (i ? "," : "") << CsvField(ToUtf8((range.*kMembers[i]).value_or("")).str());
         csv << "\r\n";
     }
     WriteFileAtomically(options_.args[0], csv.str(), "the picture ranges");
@@ -296,7 +297,8 @@ int PicturesCommand::importFrom(const PictureDb& db, std::ostream& out) const {
                     " the picture settings can list; nothing was changed");
     if (records.empty() && !options_.force)
         throw Error(file + " holds no picture ranges; importing it would delete every range of " +
-                    ResolvePath(PathFromCp1255(db.path())).shown() + ". Give --force to do that");
+                    ResolvePath(PathFromCp1255(db.path())).shown().str() +
+                    ". Give --force to do that");
     std::vector<PictureRange> ranges;
     for (size_t i = 0; i < records.size(); ++i) {
         if (records[i].size() != 5)

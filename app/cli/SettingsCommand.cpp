@@ -11,8 +11,8 @@
 namespace dovrel {
 
 SettingsCommand::SettingsCommand(SettingsOptions options, SettingsStore& store)
-    : options_(std::move(options)), store_(store), app_(FromUtf8(options_.app)),
-      key_(FromUtf8(options_.key)) {}
+    : options_(std::move(options)), store_(store), app_(FromUtf8(Utf8(options_.app))),
+      key_(FromUtf8(Utf8(options_.key))) {}
 
 int SettingsCommand::run(std::ostream& out, std::ostream& err) {
     if (app_.empty())
@@ -24,7 +24,7 @@ int SettingsCommand::run(std::ostream& out, std::ostream& err) {
     if (options_.action == "get")
         return get(out, err);
     if (options_.action == "set") {
-        store_.SaveSetting(app_, kSection, key_, FromUtf8(options_.value));
+        store_.SaveSetting(app_, kSection, key_, FromUtf8(Utf8(options_.value)));
         return 0;
     }
     if (options_.action == "unset")

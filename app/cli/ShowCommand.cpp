@@ -74,7 +74,8 @@ int ShowCommand::run(std::ostream& out, std::ostream& err) {
     read(card);
     std::vector<RecordedMessages::Shown> shown = messages.take();
     for (const auto& message : shown)
-        err << "dovrel: " << ToTerminal(message.title) << ": " << ToTerminal(message.text) << '\n';
+        err << "dovrel: " << TerminalText(message.title) << ": " << TerminalText(message.text)
+            << '\n';
     if (!shown.empty())
         return kExitFailed;
     if (!card.document()) {

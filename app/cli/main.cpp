@@ -98,7 +98,7 @@ bool UnknownCommand(CLI::App& app, int argc, char** argv) {
             return false;
         names += (names.empty() ? "" : ", ") + command->get_name();
     }
-    std::cerr << "dovrel: unknown command \"" << dovrel::TerminalText(word)
+    std::cerr << "dovrel: unknown command \"" << dovrel::TerminalText(dovrel::ValidUtf8(word))
               << "\"; the commands are " << names << " (dovrel --help tells more)\n";
     return true;
 }
@@ -116,12 +116,12 @@ int Run(const Runner& run) {
     try {
         return Finish(run ? run() : dovrel::kExitUsage);
     } catch (const dovrel::CommandError& e) {
-        std::cerr << "dovrel: " << dovrel::TerminalText(e.what()) << '\n';
+        std::cerr << "dovrel: " << dovrel::TerminalText(dovrel::ErrorText(e)) << '\n';
         return Finish(e.code());
     } catch (const std::bad_alloc&) {
         std::cerr << "dovrel: out of memory\n";
     } catch (const std::exception& e) {
-        std::cerr << "dovrel: " << dovrel::TerminalText(e.what()) << '\n';
+        std::cerr << "dovrel: " << dovrel::TerminalText(dovrel::ErrorText(e)) << '\n';
     } catch (...) {
         std::cerr << "dovrel: unknown failure\n";
     }

@@ -3,6 +3,7 @@
 #include "app/qt/CardWidget.h"
 #include "app/qt/QtText.h"
 #include "control/CardInterface.h"
+#include "platform/Error.h"
 
 #include <vector>
 
@@ -20,7 +21,7 @@ QVariant CardObject::invoke(const char* name, const QVariantList& args) {
         widget_.call([&] { result = CardInterface::Invoke(widget_.card(), name, values); });
         return ToQVariant(result);
     } catch (const std::exception& failure) {
-        lastError_ = QString::fromUtf8(failure.what());
+        lastError_ = ToQString(ErrorText(failure));
         emit failed(lastError_);
         return QVariant();
     }

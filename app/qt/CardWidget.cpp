@@ -134,7 +134,7 @@ void CardWidget::runForUser(const std::function<void()>& step) {
 }
 
 void CardWidget::reportFailure(const std::exception& failure) {
-    ShowFailure(card_->services().messages, "תקלה", failure);
+    ShowFailure(card_->services().messages, Utf8("תקלה"), failure);
 }
 
 } // namespace dovrel

@@ -41,12 +41,13 @@ FormLayout StackedLayout(const Form& form) {
 
 FormLayout FormDialog::LayoutOf(const Form& form) {
     if (form.name() == "frmItemPics")
-        return {FromUtf8(kItemPicsCaptionUtf8), kItemPicsDesignWidth, kItemPicsDesignHeight,
+        return {FromUtf8(Utf8(kItemPicsCaptionUtf8)), kItemPicsDesignWidth, kItemPicsDesignHeight,
                 ItemPicsDesign()};
     if (form.name() == "frmOpenDir")
-        return {FromUtf8(kOpenDirCaptionUtf8), kOpenDirWidth, kOpenDirHeight, OpenDirDesign()};
+        return {FromUtf8(Utf8(kOpenDirCaptionUtf8)), kOpenDirWidth, kOpenDirHeight,
+                OpenDirDesign()};
     if (form.name() == "frmAccDetails")
-        return {FromUtf8(kAccDetailsCaptionUtf8), kAccDetailsWidth, kAccDetailsHeight,
+        return {FromUtf8(Utf8(kAccDetailsCaptionUtf8)), kAccDetailsWidth, kAccDetailsHeight,
                 AccDetailsDesign()};
     return StackedLayout(form);
 }
@@ -80,7 +81,7 @@ void FormDialog::run(const std::function<void()>& step) {
     try {
         step();
     } catch (const std::exception& failure) {
-        ShowFailure(messages_, "תקלה", failure);
+        ShowFailure(messages_, Utf8("תקלה"), failure);
     }
     binder_->refresh();
     closeIfHidden();

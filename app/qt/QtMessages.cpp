@@ -32,8 +32,7 @@ void QtMessages::setRunner(Runner runner) {
 
 // A box closed without a button (Escape, the window's close button) answers
 // OK when OK is its only button and No when it asks a question.
-MsgAnswer QtMessages::show(MsgIcon icon, MsgButtons buttons, const std::string& title,
-                           const std::string& text) {
+MsgAnswer QtMessages::show(MsgIcon icon, MsgButtons buttons, const Utf8& title, const Utf8& text) {
     bool question = buttons == MsgButtons::YesNo;
     QMessageBox box(BoxIcon(icon), ToQString(title), ToQString(text),
                     question ? QMessageBox::Yes | QMessageBox::No : QMessageBox::Ok, parent_);

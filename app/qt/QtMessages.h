@@ -26,8 +26,7 @@ public:
     // The hold on the control's input, let go while a box is open.
     void setInputHold(InputHold* hold) { hold_ = hold; }
 
-    MsgAnswer show(MsgIcon icon, MsgButtons buttons, const std::string& title,
-                   const std::string& text) override;
+    MsgAnswer show(MsgIcon icon, MsgButtons buttons, const Utf8& title, const Utf8& text) override;
 
 private:
     QWidget* parent_;

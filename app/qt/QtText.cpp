@@ -8,13 +8,15 @@
 namespace dovrel {
 
 QString ToQString(std::string_view cp1255) {
-    std::string utf8 = ToUtf8(cp1255);
-    return QString::fromUtf8(utf8.data(), static_cast<qsizetype>(utf8.size()));
+    return ToQString(ToUtf8(cp1255));
+}
+
+QString ToQString(const Utf8& text) {
+    return QString::fromUtf8(text.str().data(), static_cast<qsizetype>(text.str().size()));
 }
 
 std::string FromQString(const QString& text) {
-    QByteArray utf8 = text.toUtf8();
-    return FromUtf8(std::string_view(utf8.constData(), static_cast<size_t>(utf8.size())));
+    return FromUtf8(Utf8(text.toUtf8().toStdString()));
 }
 
 Variant FromQVariant(const QVariant& value) {

@@ -6,6 +6,7 @@
 #include <string>
 #include <string_view>
 
+#include "platform/Encoding.h"
 #include "platform/Variant.h"
 
 namespace dovrel {
@@ -13,6 +14,7 @@ namespace dovrel {
 // The edge between the core's code page 1255 texts and Qt's strings; every
 // conversion goes through platform/Encoding.h.
 QString ToQString(std::string_view cp1255);
+QString ToQString(const Utf8& text);
 std::string FromQString(const QString& text);
 
 // Whether a text, spaces aside, is a number as the control writes them

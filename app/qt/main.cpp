@@ -75,7 +75,7 @@ int main(int argc, char* argv[]) {
         control.ShowDoc(text, static_cast<short>(options.type), options.start);
     }
     if (!control.lastError().isEmpty())
-        messages.show(MsgIcon::Critical, MsgButtons::Ok, FromUtf8("תקלה"),
-                      FromQString(control.lastError()));
+        messages.show(MsgIcon::Critical, MsgButtons::Ok, Utf8("תקלה"),
+                      Utf8(control.lastError().toStdString()));
     return QApplication::exec();
 }

@@ -41,7 +41,7 @@ Variant HostArgs::scalar(size_t index, const char* what) const {
 std::string HostArgs::Text(const nlohmann::json& value, const std::string& what) {
     if (!value.is_string())
         throw Error(what + " must be a string");
-    return FromUtf8(value.get_ref<const std::string&>());
+    return FromUtf8(Utf8(value.get_ref<const std::string&>()));
 }
 
 int64_t HostArgs::Integer(const nlohmann::json& value, const std::string& what, int64_t min,
@@ -75,7 +75,7 @@ Variant HostArgs::Scalar(const nlohmann::json& value, const std::string& what) {
     if (value.is_number())
         return Variant(value.get<double>());
     if (value.is_string())
-        return Variant(FromUtf8(value.get_ref<const std::string&>()));
+        return Variant(FromUtf8(Utf8(value.get_ref<const std::string&>())));
     throw Error(what + " must be null, a number, a string or a boolean");
 }
 

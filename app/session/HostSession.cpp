@@ -98,7 +98,7 @@ std::string HostSession::handle(std::string_view line) {
     if (!browser_.opened.empty()) {
         reply["opened"] = json::array();
         for (const std::string& path : browser_.opened)
-            reply["opened"].push_back(ValidUtf8(path));
+            reply["opened"].push_back(ValidUtf8(path).str());
         browser_.opened.clear();
     }
     return StateJson::Dump(reply);

@@ -199,15 +199,15 @@ json StateJson::Messages(const std::vector<RecordedMessages::Shown>& shown) {
                            : message.icon == MsgIcon::Question ? "question"
                                                                : "information";
         list.push_back({{"icon", icon},
-                        {"title", Text(message.title)},
-                        {"text", Text(message.text)},
+                        {"title", message.title.str()},
+                        {"text", message.text.str()},
                         {"buttons", message.buttons == MsgButtons::Ok ? "ok" : "yesno"}});
     }
     return list;
 }
 
 json StateJson::Text(std::string_view cp1255) {
-    return ToUtf8(cp1255);
+    return ToUtf8(cp1255).str();
 }
 
 json StateJson::Number(double value) {

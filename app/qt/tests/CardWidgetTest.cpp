@@ -176,20 +176,21 @@ TEST_F(CardWidgetTest, MessageBoxesCarryTheExactTitleTextIconAndButtons) {
     for (auto [button, expected] :
          {std::pair{QMessageBox::Yes, MsgAnswer::Yes}, {QMessageBox::No, MsgAnswer::No}}) {
         answer = button;
-        EXPECT_EQ(
-            messages.show(MsgIcon::Question, MsgButtons::YesNo, W("שימו לב"), W("האם למחוק?")),
-            expected);
+        EXPECT_EQ(messages.show(MsgIcon::Question, MsgButtons::YesNo, Utf8("שימו לב"),
+                                Utf8("האם למחוק?")),
+                  expected);
     }
     ASSERT_EQ(boxes.size(), 3u);
     EXPECT_EQ(boxes[2].title, Q("שימו לב"));
     EXPECT_EQ(boxes[2].icon, QMessageBox::Question);
     EXPECT_EQ(boxes[2].buttons, QMessageBox::Yes | QMessageBox::No);
 
-    // A failure's description is UTF-8 and reads as written, Hebrew path and all.
-    widget->runForUser([] { throw Error("Cannot open /home/משה/ISHP.FIX"); });
+    // A failure's description is UTF-8 and reads as written, whatever the
+    // letters of the path: Cyrillic has no place in the control's code page.
+    widget->runForUser([] { throw Error("Cannot open /tmp/Документы/משה/ISHP.FIX"); });
     ASSERT_EQ(boxes.size(), 4u);
     EXPECT_EQ(boxes[3].title, Q("תקלה"));
-    EXPECT_EQ(boxes[3].text, Q("Cannot open /home/משה/ISHP.FIX"));
+    EXPECT_EQ(boxes[3].text, Q("Cannot open /tmp/Документы/משה/ISHP.FIX"));
 }
 
 TEST_F(CardWidgetTest, MembersCanBeCalledByName) {
