@@ -4,6 +4,7 @@
 #include <unicode/utf8.h>
 
 #include <array>
+#include <cstdint>
 
 namespace dovrel {
 namespace {
@@ -102,8 +103,8 @@ std::string ToTerminal(std::string_view cp1255) {
     return out;
 }
 
-Utf8 ValidUtf8(std::string_view bytes) {
-    std::string out;
+std::vector<int32_t> CodePoints(std::string_view bytes) {
+    std::vector<int32_t> out;
     out.reserve(bytes.size());
     const auto* s = reinterpret_cast<const uint8_t*>(bytes.data());
     auto length = static_cast<int32_t>(bytes.size());
@@ -111,8 +112,16 @@ Utf8 ValidUtf8(std::string_view bytes) {
     while (i < length) {
         UChar32 c = 0;
         U8_NEXT(s, i, length, c);
-        AppendUtf8(out, c < 0 ? 0xFFFD : c);
+        out.push_back(c < 0 ? -1 : c);
     }
+    return out;
+}
+
+Utf8 ValidUtf8(std::string_view bytes) {
+    std::string out;
+    out.reserve(bytes.size());
+    for (int32_t c : CodePoints(bytes))
+        AppendUtf8(out, c < 0 ? 0xFFFD : c);
     return Utf8(std::move(out));
 }
 
@@ -120,12 +129,7 @@ std::string FromUtf8(const Utf8& utf8) {
     const Cp1255Table& table = Table();
     std::string out;
     out.reserve(utf8.str().size());
-    const auto* s = reinterpret_cast<const uint8_t*>(utf8.str().data());
-    auto length = static_cast<int32_t>(utf8.str().size());
-    int32_t i = 0;
-    while (i < length) {
-        UChar32 c = 0;
-        U8_NEXT(s, i, length, c);
+    for (int32_t c : CodePoints(utf8.view())) {
         int b = c < 0 ? -1 : table.fromUnicode(c);
         out.push_back(b < 0 ? '?' : static_cast<char>(b));
     }

@@ -1,8 +1,10 @@
 #pragma once
 
+#include <cstdint>
 #include <string>
 #include <string_view>
 #include <utility>
+#include <vector>
 
 namespace dovrel {
 
@@ -51,6 +53,10 @@ std::string FromUtf8(const Utf8& utf8);
 // becomes U+FFFD, so stored bytes can neither move the cursor, change the
 // terminal's state nor start a line. TerminalText does the same for UTF-8.
 std::string ToTerminal(std::string_view cp1255);
+
+// The Unicode code points of bytes that should be UTF-8, with -1 for each
+// malformed sequence: the one UTF-8 decoder, under the functions here.
+std::vector<int32_t> CodePoints(std::string_view bytes);
 
 // Bytes that should be UTF-8 (a file name, an error's description) as valid
 // UTF-8: each malformed sequence becomes U+FFFD.

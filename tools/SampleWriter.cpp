@@ -77,17 +77,9 @@ std::string HexCode(UChar32 c) {
 }
 
 std::vector<UChar32> CodePoints(std::string_view utf8) {
-    std::vector<UChar32> out;
-    const auto* s = reinterpret_cast<const uint8_t*>(utf8.data());
-    auto length = static_cast<int32_t>(utf8.size());
-    int32_t i = 0;
-    while (i < length) {
-        UChar32 c = 0;
-        U8_NEXT(s, i, length, c);
-        if (c < 0)
-            throw Error("text is not valid UTF-8");
-        out.push_back(c);
-    }
+    std::vector<UChar32> out = dovrel::CodePoints(utf8);
+    if (std::find(out.begin(), out.end(), -1) != out.end())
+        throw Error("text is not valid UTF-8");
     return out;
 }
 
