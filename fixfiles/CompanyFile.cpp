@@ -49,22 +49,24 @@ std::optional<Path> AdfPath(const Path& pCompPath) {
     return ResolvePath(path);
 }
 
+// Reads record 1 of the adf.fix found at path. The stamp is taken before the
+// read, so a change made during it shows at the next look.
+bool ReadAdfAt(const Path& path, const std::optional<FileStamp>& stamp, CompanyRecord& company) {
+    RecordFile file(path, kAdfRecordLength);
+    const unsigned char* record = file.record(1);
+    if (record == nullptr)
+        return false;
+    company.bytes.assign(reinterpret_cast<const char*>(record), kAdfRecordLength);
+    company.source = stamp;
+    return true;
+}
+
 } // namespace
 
 bool ReadAdf(const Path& pCompPath, CompanyRecord& company) {
     try {
         std::optional<Path> path = AdfPath(pCompPath);
-        if (!path)
-            return false;
-        // Taken before the read: a change made during it shows at the next look.
-        std::optional<FileStamp> stamp = StampOf(*path);
-        RecordFile file(*path, kAdfRecordLength);
-        const unsigned char* record = file.record(1);
-        if (record == nullptr)
-            return false;
-        company.bytes.assign(reinterpret_cast<const char*>(record), kAdfRecordLength);
-        company.source = stamp;
-        return true;
+        return path && ReadAdfAt(*path, StampOf(*path), company);
     } catch (...) {
         return false;
     }
@@ -78,10 +80,10 @@ bool LoadCompany(const Path& pCompPath, CompanyRecord& company) {
         std::optional<FileStamp> stamp = StampOf(*path);
         if (stamp && company.source == stamp)
             return true;
+        return ReadAdfAt(*path, stamp, company);
     } catch (...) {
         return false;
     }
-    return ReadAdf(pCompPath, company);
 }
 
 } // namespace dovrel
