@@ -4,56 +4,45 @@
 
 #include "platform/Error.h"
 
+#include <chrono>
 #include <cstdio>
 
 namespace dovrel {
 
 namespace {
 
-// Days from 1970-01-01 to 1899-12-30, the day of serial 0.
-constexpr int64_t kSerialEpoch = -25569;
+namespace chr = std::chrono;
+
+// The day of serial 0.
+constexpr chr::sys_days kSerialEpoch = chr::sys_days(chr::year(1899) / 12 / 30);
 // Serials of 0100-01-01 and 9999-12-31, the range a date may take.
 constexpr int64_t kFirstSerial = -657434;
 constexpr int64_t kLastSerial = 2958465;
 // Larger parts cannot be handled without overflow; no such part names a
 // date in range unless another part cancels it out by as much.
 constexpr int64_t kPartLimit = 1'000'000'000;
+// The Gregorian calendar repeats every 400 years, which are this many days.
+constexpr int64_t kDaysPer400Years = 146097;
 
 int64_t FloorDiv(int64_t a, int64_t b) {
     int64_t q = a / b;
     return (a % b != 0 && (a < 0) != (b < 0)) ? q - 1 : q;
 }
 
-// Days since 1970-01-01 of a proleptic Gregorian date with month 1..12.
-int64_t DaysFromCivil(int64_t y, int64_t m, int64_t d) {
-    y -= m <= 2 ? 1 : 0;
-    int64_t era = FloorDiv(y, 400);
-    int64_t yoe = y - era * 400;
-    int64_t doy = (153 * (m > 2 ? m - 3 : m + 9) + 2) / 5 + d - 1;
-    int64_t doe = yoe * 365 + yoe / 4 - yoe / 100 + doy;
-    return era * 146097 + doe - 719468;
+// The serial of the first day of a month (1..12) of any year: the year is
+// brought into the calendar types' range by whole 400-year cycles.
+int64_t SerialOfMonth(int64_t year, int64_t month) {
+    int64_t cycles = FloorDiv(year, 400);
+    chr::year_month_day first(chr::year(static_cast<int>(year - cycles * 400)),
+                              chr::month(static_cast<unsigned>(month)), chr::day(1));
+    return (chr::sys_days(first) - kSerialEpoch).count() + cycles * kDaysPer400Years;
 }
 
-struct Civil {
-    int year;
-    int month;
-    int day;
-};
-
-Civil CivilFromSerial(int64_t serial) {
+chr::year_month_day CivilFromSerial(int64_t serial) {
     if (serial < kFirstSerial || serial > kLastSerial) {
         throw Error("Invalid date");
     }
-    int64_t z = serial + kSerialEpoch + 719468;
-    int64_t era = FloorDiv(z, 146097);
-    int64_t doe = z - era * 146097;
-    int64_t yoe = (doe - doe / 1460 + doe / 36524 - doe / 146096) / 365;
-    int64_t doy = doe - (365 * yoe + yoe / 4 - yoe / 100);
-    int64_t mp = (5 * doy + 2) / 153;
-    int64_t d = doy - (153 * mp + 2) / 5 + 1;
-    int64_t m = mp < 10 ? mp + 3 : mp - 9;
-    int64_t y = yoe + era * 400 + (m <= 2 ? 1 : 0);
-    return {static_cast<int>(y), static_cast<int>(m), static_cast<int>(d)};
+    return chr::year_month_day(kSerialEpoch + chr::days(serial));
 }
 
 constexpr int kMaxPart = 32767;
@@ -98,13 +87,13 @@ int64_t FullYear(int year) {
 } // namespace
 
 int Date::year() const {
-    return CivilFromSerial(serial).year;
+    return static_cast<int>(CivilFromSerial(serial).year());
 }
 int Date::month() const {
-    return CivilFromSerial(serial).month;
+    return static_cast<int>(static_cast<unsigned>(CivilFromSerial(serial).month()));
 }
 int Date::day() const {
-    return CivilFromSerial(serial).day;
+    return static_cast<int>(static_cast<unsigned>(CivilFromSerial(serial).day()));
 }
 
 Date DateSerial(int64_t year, int64_t month, int64_t day) {
@@ -115,7 +104,7 @@ Date DateSerial(int64_t year, int64_t month, int64_t day) {
     int64_t monthIndex = month - 1;
     int64_t fullYear = year + FloorDiv(monthIndex, 12);
     int64_t monthOfYear = monthIndex - FloorDiv(monthIndex, 12) * 12 + 1;
-    int64_t serial = DaysFromCivil(fullYear, monthOfYear, 1) + (day - 1) - kSerialEpoch;
+    int64_t serial = SerialOfMonth(fullYear, monthOfYear) + (day - 1);
     if (serial < kFirstSerial || serial > kLastSerial) {
         throw Error("Invalid date");
     }
@@ -135,9 +124,10 @@ Date TextToDate(std::string_view text) {
 }
 
 std::string FormatDate(const Date& date) {
-    Civil civil = CivilFromSerial(date.serial);
+    chr::year_month_day civil = CivilFromSerial(date.serial);
     char buffer[48];
-    std::snprintf(buffer, sizeof buffer, "%02d/%02d/%04d", civil.day, civil.month, civil.year);
+    std::snprintf(buffer, sizeof buffer, "%02u/%02u/%04d", static_cast<unsigned>(civil.day()),
+                  static_cast<unsigned>(civil.month()), static_cast<int>(civil.year()));
     return buffer;
 }
 
