@@ -87,17 +87,18 @@ bool IsHidden(const std::string& name) {
     return name.starts_with('.');
 }
 
-// The visible subdirectories of root, in name order, as native names.
-std::vector<std::string> Subdirectories(const std::string& root) {
-    std::string native = ResolvePath(PathFromCp1255(root)).native();
+// The visible subdirectories of a folder, in name order, as native names.
+std::vector<std::string> Subdirectories(const fs::path& folder) {
     std::error_code ec;
-    fs::directory_iterator it(native, ec);
+    fs::directory_iterator it(folder, ec);
     if (ec)
-        throw Error("Cannot list the directory " + native + ": " + ec.message());
+        throw Error("Cannot list the directory " + Path(folder.string()).shown().str() + ": " +
+                    ec.message());
     std::vector<std::string> names;
     for (; it != fs::directory_iterator(); it.increment(ec)) {
         if (ec)
-            throw Error("Cannot list the directory " + native + ": " + ec.message());
+            throw Error("Cannot list the directory " + Path(folder.string()).shown().str() + ": " +
+                        ec.message());
         std::string name = it->path().filename().string();
         std::error_code typeError;
         if (!IsHidden(name) && it->is_directory(typeError))
@@ -182,26 +183,44 @@ std::string ListedName(const CompanyEntry& entry) {
     return std::string(Trim(entry.name));
 }
 
-std::vector<CompanyEntry> FindCompanies(const std::string& root) {
-    std::string main = WithSeparator(root);
-    fs::path nativeMain = ResolvePath(PathFromCp1255(main)).native();
+namespace {
+
+// The companies in the folders of main (native, ending in a separator);
+// mainText is main as the control names it. The control cannot open a folder
+// whose name its code page lacks, so such folders are left out unless the
+// caller works with native names.
+std::vector<CompanyEntry> CompaniesIn(const Path& main, const std::string& mainText,
+                                      bool nativeNames) {
+    fs::path resolved = ResolvePath(main).native();
     std::vector<CompanyEntry> table;
-    for (const std::string& native : Subdirectories(main)) {
-        std::string name = FromUtf8(Utf8(native));
-        // A directory the core's code page cannot name could not be opened.
-        if (ToUtf8(name).str() != native)
+    for (const std::string& native : Subdirectories(resolved)) {
+        std::string name = FromUtf8(ValidUtf8(native));
+        if (!nativeNames && ToUtf8(name).str() != native)
             continue;
-        fs::path file = CompanyFileIn(nativeMain / native);
+        fs::path file = CompanyFileIn(resolved / native);
         if (file.empty())
             continue;
         std::string stored = ReadStoredName(file);
         std::string companyName = WAsc2Heb(Trim(stored));
         companyName.resize(kCompanyNameField, ' ');
-        table.push_back({main + name, std::move(companyName), ReadingOrderText(stored)});
+        table.push_back({mainText + name, std::move(companyName), ReadingOrderText(stored),
+                         Path(main.native() + native)});
     }
     if (!table.empty())
         SortCompanies(table, 0, static_cast<int32_t>(table.size()) - 1);
     return table;
+}
+
+} // namespace
+
+std::vector<CompanyEntry> FindCompanies(const std::string& root) {
+    std::string main = WithSeparator(root);
+    return CompaniesIn(PathFromCp1255(main), main, false);
+}
+
+std::vector<CompanyEntry> FindCompanies(const Path& root) {
+    Path main(WithSeparator(root.native()));
+    return CompaniesIn(main, FromUtf8(main.shown()), true);
 }
 
 } // namespace dovrel

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "platform/Path.h"
+
 #include <cstddef>
 #include <cstdint>
 #include <string>
@@ -22,6 +24,8 @@ struct CompanyEntry {
     // The stored name in the order people read it, trimmed, for lists
     // outside the control.
     std::string readingName;
+    // The company directory by its native name.
+    Path folder;
 };
 
 // A stored company name (DOS Hebrew, visual order) as text in logical order,
@@ -44,6 +48,9 @@ void SortCompanies(std::vector<CompanyEntry>& table, int32_t lo, int32_t hi);
 // in the same order. An empty root scans "/". A main directory that cannot be
 // listed or a company file that cannot be read is an Error.
 std::vector<CompanyEntry> FindCompanies(const std::string& root);
+// The same for a main directory named natively: folders whose names the code
+// page lacks are listed too, and each entry's folder is the one to open.
+std::vector<CompanyEntry> FindCompanies(const Path& root);
 
 // The name a list shows for an entry: the name without surrounding spaces;
 // empty for a blank name, which a list leaves out.

@@ -22,7 +22,7 @@ std::string Cause() {
 } // namespace
 
 void PageFile::commit() const {
-    WriteFileAtomically(path_.native(), text_, "the page");
+    WriteFileAtomically(path_, text_, "the page");
 }
 
 Path PrivatePageDir() {

@@ -159,10 +159,8 @@ void RemoveIfThere(const std::string& fsPath, const std::string& failure) {
 
 } // namespace
 
-PictureDb::PictureDb(std::string path) : path_(std::move(path)) {}
-
 PictureDb::Inspection PictureDb::inspect() const {
-    std::string fsPath = ResolvePath(PathFromCp1255(path_)).native();
+    std::string fsPath = ResolvePath(file_).native();
     struct stat info {};
     if (stat(fsPath.c_str(), &info) != 0) {
         if (errno == ENOENT || errno == ENOTDIR)
@@ -195,14 +193,14 @@ namespace {
 
 // Opens an existing picture database; a file of another kind is refused
 // before anything is read from or written to its tables.
-std::unique_ptr<Connection> OpenPictures(const std::string& path, bool write,
+std::unique_ptr<Connection> OpenPictures(const Path& file, bool write,
                                          std::chrono::milliseconds timeout, const char* doing) {
-    std::string fsPath = ResolvePath(PathFromCp1255(path)).native();
+    std::string fsPath = ResolvePath(file).native();
     std::string failure = std::string(doing) + " " + fsPath;
     struct stat info {};
     if (stat(fsPath.c_str(), &info) != 0)
         ThrowSystemError(doing, fsPath, errno);
-    CheckReadSource(fsPath, PictureDb::kMaxFileSize, "the picture database");
+    CheckReadSource(Path(fsPath), PictureDb::kMaxFileSize, "the picture database");
     int flags = write ? SQLITE_OPEN_READWRITE : SQLITE_OPEN_READONLY;
     if (std::string reason = ForeignReason(Head(fsPath, 100)); !reason.empty())
         throw Error(failure + ": not a picture database: " + reason);
@@ -215,7 +213,7 @@ std::unique_ptr<Connection> OpenPictures(const std::string& path, bool write,
 } // namespace
 
 std::vector<PictureRange> PictureDb::query(const char* sql) const {
-    auto db = OpenPictures(path_, false, busyTimeout_, "Cannot read the picture database");
+    auto db = OpenPictures(file_, false, busyTimeout_, "Cannot read the picture database");
     Statement rows(*db, sql);
     std::vector<PictureRange> ranges;
     while (rows.step())
@@ -250,15 +248,14 @@ void PictureDb::replaceAll(const std::vector<PictureRange>& ranges) const {
     const char* doing = "Cannot save the picture ranges to";
     for (size_t i = 0; i < ranges.size(); ++i)
         if (std::string problem = problemOf(ranges[i]); !problem.empty())
-            throw Error(std::string(doing) + " " +
-                        ResolvePath(PathFromCp1255(path_)).shown().str() + ": row " +
+            throw Error(std::string(doing) + " " + ResolvePath(file_).shown().str() + ": row " +
                         std::to_string(i + 1) + ": " + problem + "; nothing was changed");
     if (ranges.size() > kMaxRanges)
-        throw Error(std::string(doing) + " " + ResolvePath(PathFromCp1255(path_)).shown().str() +
-                    ": " + std::to_string(ranges.size()) + " ranges are more than the " +
+        throw Error(std::string(doing) + " " + ResolvePath(file_).shown().str() + ": " +
+                    std::to_string(ranges.size()) + " ranges are more than the " +
                     std::to_string(kMaxRanges) +
                     " the picture settings can list; nothing was changed");
-    auto db = OpenPictures(path_, true, busyTimeout_, doing);
+    auto db = OpenPictures(file_, true, busyTimeout_, doing);
     db->begin("BEGIN IMMEDIATE");
     Statement upsert(*db, kUpsert);
     for (size_t i = 0; i < ranges.size(); ++i) {
@@ -276,9 +273,8 @@ void PictureDb::replaceAll(const std::vector<PictureRange>& ranges) const {
 int32_t PictureDb::add(PictureRange range) const {
     const char* doing = "Cannot add a picture range to";
     if (std::string problem = problemOf(range); !problem.empty())
-        throw Error(std::string(doing) + " " + ResolvePath(PathFromCp1255(path_)).shown().str() +
-                    ": " + problem);
-    auto db = OpenPictures(path_, true, busyTimeout_, doing);
+        throw Error(std::string(doing) + " " + ResolvePath(file_).shown().str() + ": " + problem);
+    auto db = OpenPictures(file_, true, busyTimeout_, doing);
     db->begin("BEGIN IMMEDIATE");
     Statement last(*db, "SELECT coalesce(max(RangeID), 0) FROM tItemPicture");
     last.step();
@@ -287,11 +283,10 @@ int32_t PictureDb::add(PictureRange range) const {
     Statement count(*db, "SELECT count(*) FROM tItemPicture");
     count.step();
     if (count.integer(0) >= static_cast<int64_t>(kMaxRanges))
-        throw Error(std::string(doing) + " " + ResolvePath(PathFromCp1255(path_)).shown().str() +
-                    ": it holds " + std::to_string(kMaxRanges) +
-                    " ranges, the most the picture settings can list");
+        throw Error(std::string(doing) + " " + ResolvePath(file_).shown().str() + ": it holds " +
+                    std::to_string(kMaxRanges) + " ranges, the most the picture settings can list");
     if (highest >= INT32_MAX)
-        throw Error(std::string(doing) + " " + ResolvePath(PathFromCp1255(path_)).shown().str() +
+        throw Error(std::string(doing) + " " + ResolvePath(file_).shown().str() +
                     ": no range number is free");
     int32_t rangeId = static_cast<int32_t>(std::max<int64_t>(highest, 0) + 1);
     Statement insert(*db, kUpsert);
@@ -302,7 +297,7 @@ int32_t PictureDb::add(PictureRange range) const {
 }
 
 bool PictureDb::remove(int32_t rangeId) const {
-    auto db = OpenPictures(path_, true, busyTimeout_, "Cannot delete a picture range from");
+    auto db = OpenPictures(file_, true, busyTimeout_, "Cannot delete a picture range from");
     Statement erase(*db, "DELETE FROM tItemPicture WHERE RangeID = ?1");
     erase.bind(1, rangeId);
     erase.step();
@@ -373,9 +368,9 @@ private:
 } // namespace
 
 void PictureDb::create(bool replaceForeign) const {
-    std::string fsPath = ResolvePath(PathFromCp1255(path_)).native();
+    std::string fsPath = ResolvePath(file_).native();
     std::string failure = "Cannot create the picture database " + fsPath;
-    CheckWriteTarget(fsPath, "the picture database");
+    CheckWriteTarget(Path(fsPath), "the picture database");
     Inspection old = inspect();
     if (old.kind == FileKind::Foreign && !replaceForeign)
         throw Error(failure + ": the file there is not a picture database (" + old.reason +

@@ -1,9 +1,12 @@
 #pragma once
 
+#include "platform/Path.h"
+
 #include <chrono>
 #include <cstdint>
 #include <optional>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace dovrel {
@@ -46,8 +49,11 @@ public:
         std::string reason; // why a foreign file is not a picture database
     };
 
-    explicit PictureDb(std::string path);
-    const std::string& path() const { return path_; }
+    // The database file by its native name, or by a name of the control's
+    // kind (code page 1255 text).
+    explicit PictureDb(Path file) : file_(std::move(file)) {}
+    explicit PictureDb(const std::string& cp1255) : PictureDb(PathFromCp1255(cp1255)) {}
+    const Path& file() const { return file_; }
     void setBusyTimeout(std::chrono::milliseconds timeout) { busyTimeout_ = timeout; }
 
     // Whether the file is missing, a picture database, or something else.
@@ -78,7 +84,7 @@ public:
 private:
     std::vector<PictureRange> query(const char* sql) const;
 
-    std::string path_;
+    Path file_;
     std::chrono::milliseconds busyTimeout_{5000};
 };
 

@@ -15,15 +15,16 @@ namespace dovrel {
 
 namespace {
 
-[[noreturn]] void Fail(const std::string& what, const std::string& path, const std::string& why) {
-    throw Error("Cannot " + what + " " + path + ": " + why);
+[[noreturn]] void Fail(const std::string& what, const Path& path, const std::string& why) {
+    throw Error("Cannot " + what + " " + path.shown().str() + ": " + why);
 }
 
-[[noreturn]] void FailErrno(const std::string& what, const std::string& path) {
+[[noreturn]] void FailErrno(const std::string& what, const Path& path) {
     Fail(what, path, std::strerror(errno));
 }
 
-std::string FolderOf(const std::string& path) {
+std::string FolderOf(const Path& file) {
+    const std::string& path = file.native();
     size_t slash = path.find_last_of('/');
     if (slash == std::string::npos)
         return ".";
@@ -40,7 +41,7 @@ const char* KindOf(mode_t mode) {
     return "it is not a regular file";
 }
 
-void WriteAll(int fd, std::string_view bytes, const std::string& what, const std::string& path) {
+void WriteAll(int fd, std::string_view bytes, const std::string& what, const Path& path) {
     size_t done = 0;
     while (done < bytes.size()) {
         ssize_t n = ::write(fd, bytes.data() + done, bytes.size() - done);
@@ -60,11 +61,11 @@ bool IsAccountingFile(std::string_view path) {
     return EqualsNoCase(path.substr(path.size() - 4), ".fix");
 }
 
-void CheckWriteTarget(const std::string& path, const std::string& what) {
+void CheckWriteTarget(const Path& path, const std::string& what) {
     std::string doing = "write " + what;
     if (path.empty())
-        Fail(doing, "", "no file name was given");
-    if (IsAccountingFile(path))
+        Fail(doing, path, "no file name was given");
+    if (IsAccountingFile(path.native()))
         Fail(doing, path, "it is one of the accounting system's files, which Dovrel never writes");
     struct stat info {};
     if (::lstat(path.c_str(), &info) != 0) {
@@ -76,7 +77,7 @@ void CheckWriteTarget(const std::string& path, const std::string& what) {
         Fail(doing, path, KindOf(info.st_mode));
 }
 
-void WriteFileAtomically(const std::string& path, std::string_view bytes, const std::string& what) {
+void WriteFileAtomically(const Path& path, std::string_view bytes, const std::string& what) {
     CheckWriteTarget(path, what);
     std::string doing = "write " + what;
     std::string temp = FolderOf(path) + "/.dovrel-XXXXXX";
@@ -101,7 +102,7 @@ void WriteFileAtomically(const std::string& path, std::string_view bytes, const 
     }
 }
 
-void CheckReadSource(const std::string& path, size_t limit, const std::string& what) {
+void CheckReadSource(const Path& path, size_t limit, const std::string& what) {
     std::string doing = "read " + what;
     struct stat info {};
     if (::stat(path.c_str(), &info) != 0)
@@ -113,7 +114,7 @@ void CheckReadSource(const std::string& path, size_t limit, const std::string& w
              "it is larger than " + std::to_string(limit / 1024) + " KiB, too large for " + what);
 }
 
-std::string ReadWholeFile(const std::string& path, size_t limit, const std::string& what) {
+std::string ReadWholeFile(const Path& path, size_t limit, const std::string& what) {
     std::string doing = "read " + what;
     int fd = ::open(path.c_str(), O_RDONLY | O_NONBLOCK | O_CLOEXEC);
     if (fd < 0)

@@ -9,7 +9,10 @@
 
 #include <gtest/gtest.h>
 
+#include <filesystem>
 #include <sstream>
+
+#include <stdlib.h>
 
 namespace dovrel {
 namespace {
@@ -52,6 +55,34 @@ TEST(CompaniesCommandTest, ListsNamedCompaniesInTheChoosersOrder) {
     std::ostringstream out;
     EXPECT_THROW(CompaniesCommand({dir + "/missing", false}).run(out, out), Error);
     EXPECT_THROW(CompaniesCommand({"", false}).run(out, out), Error);
+}
+
+// Folders the Hebrew code page cannot name (Cyrillic) are listed and used
+// under their own names.
+TEST(CompaniesCommandTest, FoldersOfAnyNameWork) {
+    test::TempDir main;
+    std::filesystem::path folder = main.path() / "Документы";
+    setenv("XDG_CONFIG_HOME", (main.path() / "config").c_str(), 1);
+    nlohmann::json company = {{"company", {{"name", "אלף"}}},
+                              {"documents", {test::Doc(20, "7", "A")}}};
+    sample::WriteCompany(company.dump(), folder / "Компания");
+    test::CliResult shown = test::RunCli({"show", (folder / "Компания").string()});
+    EXPECT_EQ(shown.code, 0) << shown.err;
+    std::string page = (folder / "page.htm").string();
+    test::CliResult printed =
+        test::RunCli({"print", (folder / "Компания").string(), "--out", page, "--no-open"});
+    EXPECT_EQ(printed.out, page + "\n") << printed.err;
+    test::CliResult listed = test::RunCli({"companies", folder.string(), "--json"});
+    EXPECT_EQ(json::parse(listed.out), json::array({Listed("אלף", (folder / "Компания").string())}))
+        << listed.err;
+    auto pictures = [&](std::vector<std::string> args) {
+        args.insert(args.begin(), {"pictures", "--db", folder.string()});
+        return test::RunCli(args);
+    };
+    EXPECT_EQ(pictures({"init"}).code, 0);
+    EXPECT_EQ(pictures({"add", "1", "2", "p.jpg"}).out, "Added range 1\n");
+    EXPECT_TRUE(std::filesystem::is_regular_file(folder / "Dovrel.def"));
+    unsetenv("XDG_CONFIG_HOME");
 }
 
 TEST(CompaniesCommandTest, ShowsAnAccountOrEmptyWords) {

@@ -17,10 +17,7 @@ namespace dovrel {
 int CompaniesCommand::run(std::ostream& out, std::ostream& err) {
     if (options_.mainDir.empty())
         throw Error("Give the main directory to scan");
-    std::string root = FromUtf8(Utf8(options_.mainDir));
-    if (ToUtf8(root).str() != options_.mainDir)
-        throw Error("The main directory cannot be named in the Hebrew code page: " +
-                    options_.mainDir);
+    Path root(options_.mainDir);
     nlohmann::json list = nlohmann::json::array();
     size_t listed = 0;
     for (const CompanyEntry& entry : FindCompanies(root)) {
@@ -29,15 +26,15 @@ int CompaniesCommand::run(std::ostream& out, std::ostream& err) {
         const std::string& name = entry.readingName;
         ++listed;
         if (options_.json)
-            list.push_back({{"name", ToUtf8(name).str()}, {"path", ToUtf8(entry.path).str()}});
+            list.push_back({{"name", ToUtf8(name).str()}, {"path", entry.folder.shown().str()}});
         else
-            out << ToTerminal(name) << '\t' << ToTerminal(entry.path) << '\n';
+            out << ToTerminal(name) << '\t' << TerminalText(entry.folder.shown()) << '\n';
     }
     if (options_.json)
         out << StateJson::Dump(list, 2) << '\n';
     if (listed > 0)
         return kExitDone;
-    err << "No companies found in " << TerminalText(Path(options_.mainDir).shown()) << '\n';
+    err << "No companies found in " << TerminalText(root.shown()) << '\n';
     return kExitNotFound;
 }
 

@@ -141,28 +141,30 @@ int32_t ParseRangeId(const std::string& text) {
 PicturesCommand::PicturesCommand(PicturesOptions options, SettingsStore& store)
     : options_(std::move(options)), store_(store) {}
 
-std::string PicturesCommand::dbName(std::ostream& err) {
+// A folder given with --db is the system's own name and stays as it is; the
+// saved DBPath setting is the control's text.
+Path PicturesCommand::dbName(std::ostream& err) {
     if (!options_.db.empty())
-        return JoinFolder(FromUtf8(Utf8(options_.db)), PictureDb::kFileName);
+        return Path(JoinFolder(options_.db, PictureDb::kFileName));
     std::string dir = store_.GetSetting(FromUtf8(Utf8(options_.app)), "Params", "DBPath", "c:\\");
     if (dir.empty() || SettingsStore::FoldCase(dir) == "c:\\") {
         err << "No picture folder is set: give one with --db DIR, or save DBPath in the picture "
                "settings (dovrel settings set DBPath DIR/)\n";
-        return "";
+        return Path();
     }
-    return JoinFolder(dir, PictureDb::kFileName);
+    return PathFromCp1255(JoinFolder(dir, PictureDb::kFileName));
 }
 
 int PicturesCommand::run(std::ostream& out, std::ostream& err) {
-    std::string name = dbName(err);
+    Path name = dbName(err);
     if (name.empty())
         return kExitFailed;
     PictureDb db(name);
     const std::string& action = options_.action;
     if (action == "init")
         return init(db, out);
-    if (action != "import" && !FileExists(PathFromCp1255(name))) {
-        err << "There is no picture database at " << ResolvePath(PathFromCp1255(name)).shown().str()
+    if (action != "import" && !FileExists(name)) {
+        err << "There is no picture database at " << ResolvePath(name).shown().str()
             << " (dovrel pictures init makes one)\n";
         return 1;
     }
@@ -189,19 +191,17 @@ void PicturesCommand::needArgs(size_t count, const char* usage) const {
 int PicturesCommand::init(const PictureDb& db, std::ostream& out) {
     PictureDb::Inspection old = db.inspect();
     if (old.kind == PictureDb::FileKind::Foreign && !options_.force)
-        throw Error("The file " + ResolvePath(PathFromCp1255(db.path())).shown().str() +
+        throw Error("The file " + ResolvePath(db.file()).shown().str() +
                     " is not a picture database (" + old.reason +
                     "); it was left as it is. Give --force to replace it");
     if (old.kind == PictureDb::FileKind::Pictures && !options_.force) {
         if (size_t held = db.rangesById().size(); held > 0)
-            throw Error("The picture database " +
-                        ResolvePath(PathFromCp1255(db.path())).shown().str() + " holds " +
+            throw Error("The picture database " + ResolvePath(db.file()).shown().str() + " holds " +
                         std::to_string(held) +
                         " ranges; it was left as it is. Give --force to empty it");
     }
     db.create(options_.force);
-    out << "Created an empty picture database at "
-        << ResolvePath(PathFromCp1255(db.path())).shown().str() << '\n';
+    out << "Created an empty picture database at " << ResolvePath(db.file()).shown().str() << '\n';
     return 0;
 }
 
@@ -248,8 +248,7 @@ int PicturesCommand::remove(const PictureDb& db, std::ostream& err) const {
     int32_t rangeId = ParseRangeId(options_.args[0]);
     if (db.remove(rangeId))
         return 0;
-    err << "No range " << rangeId << " in " << ResolvePath(PathFromCp1255(db.path())).shown().str()
-        << '\n';
+    err << "No range " << rangeId << " in " << ResolvePath(db.file()).shown().str() << '\n';
     return kExitNotFound;
 }
 
@@ -278,7 +277,7 @@ int PicturesCommand::exportTo(const PictureDb& db, std::ostream& out) const {
             csv << (i ? "," : "") << CsvField(ToUtf8((range.*kMembers[i]).value_or("")).str());
         csv << "\r\n";
     }
-    WriteFileAtomically(options_.args[0], csv.str(), "the picture ranges");
+    WriteFileAtomically(Path(options_.args[0]), csv.str(), "the picture ranges");
     out << "Wrote the picture ranges to " << options_.args[0] << '\n';
     return 0;
 }
@@ -286,7 +285,7 @@ int PicturesCommand::exportTo(const PictureDb& db, std::ostream& out) const {
 int PicturesCommand::importFrom(const PictureDb& db, std::ostream& out) const {
     needArgs(1, "import FILE.csv");
     const std::string& file = options_.args[0];
-    std::string text = ReadWholeFile(file, kMaxCsvBytes, "the picture ranges");
+    std::string text = ReadWholeFile(Path(file), kMaxCsvBytes, "the picture ranges");
     if (text.starts_with("\xEF\xBB\xBF"))
         text.erase(0, 3); // a byte-order mark
     std::vector<std::vector<std::string>> records = ParseCsv(text);
@@ -297,8 +296,7 @@ int PicturesCommand::importFrom(const PictureDb& db, std::ostream& out) const {
                     " the picture settings can list; nothing was changed");
     if (records.empty() && !options_.force)
         throw Error(file + " holds no picture ranges; importing it would delete every range of " +
-                    ResolvePath(PathFromCp1255(db.path())).shown().str() +
-                    ". Give --force to do that");
+                    ResolvePath(db.file()).shown().str() + ". Give --force to do that");
     std::vector<PictureRange> ranges;
     for (size_t i = 0; i < records.size(); ++i) {
         if (records[i].size() != 5)

@@ -34,7 +34,7 @@ public:
 
 private:
     // The database file, or "" after saying that no picture folder is set.
-    std::string dbName(std::ostream& err);
+    Path dbName(std::ostream& err);
     int init(const PictureDb& db, std::ostream& out);
     int list(const PictureDb& db, std::ostream& out) const;
     int add(const PictureDb& db, std::ostream& out) const;
