@@ -152,8 +152,8 @@ bool Card::WritePage(const Path& path) {
 // boxes hold only what an earlier document left; no page is made of that.
 void Card::PrintButt_Click() {
     if (!document()) {
-        services_.messages.show(MsgIcon::Information, MsgButtons::Ok, FromUtf8("הודעה"),
-                                FromUtf8("אין מסמך להדפסה"));
+        services_.messages.show(MsgIcon::Information, MsgButtons::Ok, Utf8("הודעה"),
+                                Utf8("אין מסמך להדפסה"));
         return;
     }
     try {

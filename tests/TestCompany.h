@@ -183,7 +183,7 @@ template <class F = Form> struct CardDesk {
     std::vector<std::string> shown() {
         std::vector<std::string> texts;
         for (const RecordedMessages::Shown& m : messages.take())
-            texts.push_back(ToUtf8(m.title) + ": " + ToUtf8(m.text));
+            texts.push_back(m.title.str() + ": " + m.text.str());
         return texts;
     }
 };

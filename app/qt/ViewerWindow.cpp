@@ -138,8 +138,8 @@ void ViewerWindow::about() {
                      "ICU: Unicode License.\n"
                      "SQLite: נחלת הכלל.")
                        .arg(QCoreApplication::applicationVersion());
-    services_.messages.show(MsgIcon::Information, MsgButtons::Ok, FromUtf8("אודות"),
-                            FromQString(text));
+    services_.messages.show(MsgIcon::Information, MsgButtons::Ok, Utf8("אודות"),
+                            Utf8(text.toUtf8().toStdString()));
 }
 
 void ViewerWindow::restorePlace() {

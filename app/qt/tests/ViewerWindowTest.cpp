@@ -330,7 +330,7 @@ TEST_F(ViewerWindowTest, TheStatusBarSaysWhatHappened) {
     EXPECT_EQ(seen[0], Q("אין מסמך להדפסה"));
 
     auto& pictures = dynamic_cast<ItemPicsForm&>(*state.Forms.at("frmItemPics"));
-    state.DBPath = FromUtf8(temp.str() + "/missing/");
+    state.DBPath = FromUtf8(Utf8(temp.str() + "/missing/"));
     EXPECT_FALSE(pictures.CheckDBFile());
     EXPECT_TRUE(window->statusText().contains(Q(temp.str() + "/missing")))
         << window->statusText().toStdString();
