@@ -87,8 +87,8 @@ std::vector<std::string> SystemMountPoints() {
     if (!FileReach::Roots().empty()) {
         std::vector<std::string> roots;
         for (const std::string& root : FileReach::Roots())
-            if (ToUtf8(FromUtf8(root)) == root)
-                roots.push_back(FromUtf8(root));
+            if (ToUtf8(FromUtf8(Utf8(root))).str() == root)
+                roots.push_back(FromUtf8(Utf8(root)));
         return roots;
     }
     FILE* table = setmntent("/proc/self/mounts", "r");

@@ -47,7 +47,7 @@ TEST(CompaniesTest, TheSortOrdersByCodePointAndLeavesEqualNamesWhereItPutsThem) 
     auto entry = [](const std::string& name, const std::string& path) {
         std::string field = name;
         field.resize(kCompanyNameField, ' ');
-        return CompanyEntry{path, field, {}};
+        return CompanyEntry{path, field, {}, {}};
     };
     // Code points, not bytes: the euro sign (byte 0x80) comes after alef (0xE0);
     // a blank name comes first. (Equal names: the scan below.)

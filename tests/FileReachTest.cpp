@@ -39,7 +39,7 @@ TEST(FileReachTest, AThreadHeldToAFolderReachesOnlyWhatLiesInIt) {
     // The chooser's scan does not name a company behind a link out.
     sample::WriteCompany(R"({"company": {"title": "in"}})", root / "co");
     sample::WriteCompany(R"({"company": {"title": "out"}})", outside);
-    EXPECT_EQ(FindCompanies(FromUtf8(root.string())).size(), 1u);
+    EXPECT_EQ(FindCompanies(Path(root.string())).size(), 1u);
 
     std::vector<std::string> drives = SystemMountPoints();
     ASSERT_EQ(drives.size(), 1u);

@@ -57,8 +57,8 @@ TEST_F(PrintRunTest, AllDeliveryNotesOfTheDemoWithTheRunsOwnChoices) {
     EXPECT_THAT(run.err, HasSubstr("5 pages written"));
     std::string page = ReadAll(folder / "20-4101.htm");
     EXPECT_THAT(page, HasSubstr("rules='none'"));
-    EXPECT_THAT(page, HasSubstr(FromUtf8("4101&nbsp;העתק")));
-    EXPECT_THAT(page, Not(HasSubstr(FromUtf8(">פרטים<"))));
+    EXPECT_THAT(page, HasSubstr(FromUtf8(Utf8("4101&nbsp;העתק"))));
+    EXPECT_THAT(page, testing::Not(HasSubstr(FromUtf8(Utf8(">פרטים<")))));
     // The run's choices were for that run only.
     EXPECT_EQ(RunCli({"settings", "list"}).out, "");
 

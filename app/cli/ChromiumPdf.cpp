@@ -58,7 +58,7 @@ void AskForA4(const std::string& page) {
     std::ofstream out(page, std::ios::binary | std::ios::trunc);
     out << text;
     if (!out.flush())
-        throw Error("Cannot prepare the page for Chromium: " + Path(page).shown());
+        throw Error("Cannot prepare the page for Chromium: " + Path(page).shown().str());
 }
 
 std::string MakeRoot() {
@@ -82,7 +82,7 @@ void MoveInPlace(const std::string& from, const Path& to) {
         fs::rename(part, to.native(), ec);
     if (ec) {
         fs::remove(part);
-        throw Error("Cannot write " + to.shown() + ": " + ec.message());
+        throw Error("Cannot write " + to.shown().str() + ": " + ec.message());
     }
 }
 
@@ -157,7 +157,7 @@ void ChromiumPdf::print(const Path& page, const Path& pdf) {
     posix_spawn_file_actions_destroy(&files);
     posix_spawnattr_destroy(&attributes);
     if (failed != 0) {
-        outcome_.failures.push_back(pdf.shown() +
+        outcome_.failures.push_back(pdf.shown().str() +
                                     ": cannot start Chromium: " + std::strerror(failed));
         return;
     }
@@ -176,7 +176,7 @@ void ChromiumPdf::reap(bool block) {
             if (late) {
                 ::kill(-job.pid, SIGKILL);
                 ::waitpid(job.pid, &status, 0);
-                outcome_.failures.push_back(job.pdf.shown() + ": Chromium took longer than " +
+                outcome_.failures.push_back(job.pdf.shown().str() + ": Chromium took longer than " +
                                             std::to_string(timeout_.count()) +
                                             " seconds and was stopped");
             } else {
@@ -199,7 +199,7 @@ void ChromiumPdf::complete(const Job& job, int status) {
     bool ok = WIFEXITED(status) && WEXITSTATUS(status) == 0 && fs::file_size(made, ec) > 0 && !ec;
     if (!ok) {
         outcome_.failures.push_back(
-            job.pdf.shown() + ": Chromium did not print the page (exit " +
+            job.pdf.shown().str() + ": Chromium did not print the page (exit " +
             (WIFEXITED(status) ? std::to_string(WEXITSTATUS(status)) : std::string("by a signal")) +
             ")");
         return;

@@ -61,11 +61,11 @@ int ExportCommand::run(std::ostream& out, std::ostream& err) {
     } else {
         std::ofstream file(options_.output, std::ios::binary | std::ios::trunc);
         if (!file)
-            throw Error("Cannot write " + TerminalText(options_.output));
+            throw Error("Cannot write " + Path(options_.output).shown().str());
         summary = exporter.run(compDir, file);
         file.close();
         if (!file)
-            throw Error("Cannot write " + TerminalText(options_.output));
+            throw Error("Cannot write " + Path(options_.output).shown().str());
     }
     if (progress_)
         *progress_ << "\r            \r" << std::flush;
@@ -80,8 +80,8 @@ void ExportCommand::report(const ExportSummary& summary, std::ostream& err) cons
         err << "dovrel: the company has no " << name << '\n';
     for (const SkippedDocument& skipped : summary.skipped)
         err << "dovrel: skipped a damaged document: " << skipped.file << " record "
-            << skipped.record << " (type " << skipped.type << "): " << TerminalText(skipped.error)
-            << '\n';
+            << skipped.record << " (type " << skipped.type
+            << "): " << TerminalText(Utf8(skipped.error)) << '\n';
     if (summary.skippedCount > static_cast<int64_t>(summary.skipped.size()))
         err << "dovrel: and " << summary.skippedCount - static_cast<int64_t>(summary.skipped.size())
             << " more damaged documents\n";

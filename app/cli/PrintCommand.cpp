@@ -49,7 +49,8 @@ private:
 
 void ReportMessages(RecordedMessages& messages, std::ostream& err, bool& any) {
     for (const auto& message : messages.take()) {
-        err << "dovrel: " << ToTerminal(message.title) << ": " << ToTerminal(message.text) << '\n';
+        err << "dovrel: " << TerminalText(message.title) << ": " << TerminalText(message.text)
+            << '\n';
         any = true;
     }
 }
@@ -106,9 +107,9 @@ void PrintCommand::applyChoices(Card& card) const {
     if (options_.rules)
         card.cmbRules.setListIndex(*options_.rules);
     if (options_.title)
-        card.txtTitle.setText(FromUtf8(*options_.title));
+        card.txtTitle.setText(FromUtf8(Utf8(*options_.title)));
     if (!options_.fromDate.empty())
-        card.txtFromDate.setText(FromUtf8(options_.fromDate));
+        card.txtFromDate.setText(FromUtf8(Utf8(options_.fromDate)));
 }
 
 int PrintCommand::run(std::ostream& out, std::ostream& err) {
@@ -130,7 +131,8 @@ int PrintCommand::run(std::ostream& out, std::ostream& err) {
     if (several && options_.out.empty())
         throw Error("Several pages need --out with a folder to write them in");
     if (several && !fs::is_directory(options_.out, ec) && !fs::create_directory(options_.out, ec))
-        throw Error("Cannot make the folder " + Path(options_.out).shown() + ": " + ec.message());
+        throw Error("Cannot make the folder " + Path(options_.out).shown().str() + ": " +
+                    ec.message());
     ClosingFormPresenter forms;
     MemoryClipboard clipboard;
     SettableClock clock;
@@ -183,11 +185,11 @@ int PrintCommand::printOne(Card& card, std::ostream& out, std::ostream& err) {
     if (pdf_) {
         ChromiumPdf::Outcome made = pdf_->finish();
         for (const std::string& failure : made.failures)
-            err << "dovrel: " << TerminalText(failure) << '\n';
+            err << "dovrel: " << TerminalText(Utf8(failure)) << '\n';
         if (!made.failures.empty())
             return kExitFailed;
     }
-    out << path.shown() << '\n';
+    out << path.shown().str() << '\n';
     if (options_.open)
         browser_.Open(path);
     return kExitDone;
@@ -213,8 +215,8 @@ int PrintCommand::printRun(Card& card, std::ostream& out, std::ostream& err) {
     Path file = shared_.Paths.native(compPath_).plus(
         shared_.DocFiles[static_cast<size_t>(type.fileNumber)]);
     if (type.fileNumber < 1 || !FileExists(file)) {
-        err << "dovrel: " << ToTerminal(FromUtf8("שגיאה")) << ": "
-            << ToTerminal(FromUtf8("קבצי מסמכים לא נמצאו")) << '\n';
+        err << "dovrel: " << TerminalText(Utf8("שגיאה")) << ": "
+            << TerminalText(Utf8("קבצי מסמכים לא נמצאו")) << '\n';
         return kExitFailed;
     }
     std::string fromText = card.txtFromDate.Text();
@@ -232,14 +234,14 @@ int PrintCommand::printRun(Card& card, std::ostream& out, std::ostream& err) {
          step = walk.next()) {
         std::string failure = step.error;
         if (step.kind == DocumentWalk::Step::Kind::Document) {
-            Path path = names.next(type.code, ToUtf8(step.document->reference.reading));
+            Path path = names.next(type.code, ToUtf8(step.document->reference.reading).str());
             try {
                 shared_.Doc = ToCurrentDocument(*step.document);
                 card.PubACTLocation = card.PubPrevLocation = step.record;
                 card.showDocument(std::move(*step.document));
                 writeOne(card, path);
                 if (!pdf_)
-                    out << path.shown() << '\n' << std::flush;
+                    out << path.shown().str() << '\n' << std::flush;
                 ++written;
             } catch (const std::exception& e) {
                 failure = e.what();
@@ -248,7 +250,7 @@ int PrintCommand::printRun(Card& card, std::ostream& out, std::ostream& err) {
         if (!failure.empty()) {
             ++skipped;
             err << (progress_ ? "\r" : "") << "dovrel: passed over the document at record "
-                << step.record << ": " << TerminalText(failure) << '\n';
+                << step.record << ": " << TerminalText(Utf8(failure)) << '\n';
         }
         showProgress(walk.position(), walk.records(), written);
         if (!options_.all && written == options_.count)
@@ -257,9 +259,9 @@ int PrintCommand::printRun(Card& card, std::ostream& out, std::ostream& err) {
     if (pdf_) {
         ChromiumPdf::Outcome made = pdf_->finish();
         for (const Path& path : made.made)
-            out << path.shown() << '\n';
+            out << path.shown().str() << '\n';
         for (const std::string& failure : made.failures)
-            err << "dovrel: " << TerminalText(failure) << '\n';
+            err << "dovrel: " << TerminalText(Utf8(failure)) << '\n';
         skipped += static_cast<int32_t>(made.failures.size());
         written -= static_cast<int32_t>(made.failures.size());
     }

@@ -106,29 +106,29 @@ std::vector<std::string> LineCells(const json& line) {
 
 } // namespace
 
-std::string ExportRecord::Utf8(const std::string& cp1255) {
-    return ToUtf8(cp1255);
+std::string ExportRecord::Text(const std::string& cp1255) {
+    return ToUtf8(cp1255).str();
 }
 
 json ExportRecord::Json(const Document& document) {
     const DocTypeRow* type = TypeRow(document.type);
     json remarks = json::array();
     for (const DocumentText& remark : document.remarks)
-        remarks.push_back(Utf8(remark.reading));
+        remarks.push_back(Text(remark.reading));
     json lines = json::array();
     for (const Document::Line& line : document.lines)
         lines.push_back(Line(document, line));
     std::string file = std::filesystem::path(document.file.native()).filename().string();
     return {{"type", document.type},
-            {"title", type ? Utf8(type->hebrewTitle) : std::string()},
-            {"file", Path(file).shown()},
+            {"title", type ? Text(type->hebrewTitle) : std::string()},
+            {"file", Path(file).shown().str()},
             {"record", document.record},
-            {"reference", Utf8(document.reference.reading)},
+            {"reference", Text(document.reference.reading)},
             {"date", IsoDate(document.date)},
-            {"account", Utf8(document.accountKey.reading)},
-            {"customer", Utf8(document.customer.reading)},
-            {"address1", Utf8(document.address1.reading)},
-            {"address2", Utf8(document.address2.reading)},
+            {"account", Text(document.accountKey.reading)},
+            {"customer", Text(document.customer.reading)},
+            {"address1", Text(document.address1.reading)},
+            {"address2", Text(document.address2.reading)},
             {"remarks", remarks},
             {"warehouse", document.warehouse},
             {"discountPercent", Number(document.discountPercent)},
@@ -146,10 +146,10 @@ json ExportRecord::Json(const Document& document) {
 // are not read, so they are null rather than a made-up zero.
 json ExportRecord::Line(const Document& document, const Document::Line& line) {
     json out = {{"line", line.lineNumber},
-                {"key", Utf8(line.itemKey.reading)},
-                {"category", Utf8(TrimCopy(line.categoryCode))},
-                {"description", Utf8(line.description.reading)},
-                {"details", Utf8(line.details.reading)},
+                {"key", Text(line.itemKey.reading)},
+                {"category", Text(TrimCopy(line.categoryCode))},
+                {"description", Text(line.description.reading)},
+                {"details", Text(line.details.reading)},
                 {"quantity", nullptr},
                 {"price", nullptr},
                 {"currency", nullptr},
@@ -174,7 +174,7 @@ json ExportRecord::Currency(const Document& document, const Document::Line& line
         if (!own.reading.empty())
             name = printed = own.reading;
     }
-    return {{"code", line.currency}, {"name", Utf8(name)}, {"printed", Utf8(printed)}};
+    return {{"code", line.currency}, {"name", Text(name)}, {"printed", Text(printed)}};
 }
 
 const std::vector<std::string>& ExportRecord::CsvColumns() {

@@ -24,7 +24,7 @@ public:
     static std::vector<std::vector<std::string>> CsvRows(const nlohmann::ordered_json& record);
 
     // A text of the control (code page 1255) as UTF-8.
-    static std::string Utf8(const std::string& cp1255);
+    static std::string Text(const std::string& cp1255);
 
 private:
     static nlohmann::ordered_json Line(const Document& document, const Document::Line& line);

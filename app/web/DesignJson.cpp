@@ -44,19 +44,19 @@ const char* KindName(ControlKind kind) {
 json Control(const ControlDesign& d) {
     json entries = json::array();
     for (const std::string& entry : d.entries)
-        entries.push_back(ToUtf8(entry));
+        entries.push_back(ToUtf8(entry).str());
     char color[8];
     std::snprintf(color, sizeof color, "#%06x", d.foreColor & 0xffffffu);
     return {{"name", d.name},
             {"kind", KindName(d.kind)},
-            {"caption", ToUtf8(d.caption)},
-            {"toolTip", ToUtf8(d.toolTip)},
+            {"caption", ToUtf8(d.caption).str()},
+            {"toolTip", ToUtf8(d.toolTip).str()},
             {"left", d.left},
             {"top", d.top},
             {"width", d.width},
             {"height", d.height},
             {"entries", std::move(entries)},
-            {"text", ToUtf8(d.text)},
+            {"text", ToUtf8(d.text).str()},
             {"labelFor", d.labelFor},
             {"picture", d.picture},
             {"grey", d.grey},

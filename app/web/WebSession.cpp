@@ -4,8 +4,10 @@
 #include "app/session/StateJson.h"
 #include "app/web/DesignJson.h"
 #include "control/ModuleState.h"
+#include "platform/Error.h"
 #include "platform/FileReach.h"
 #include "platform/ListControls.h"
+#include "platform/TerminalText.h"
 
 #include <fstream>
 #include <iostream>
@@ -95,7 +97,7 @@ void WebSession::run() {
         progressWatch_.disconnect();
     } catch (const std::exception& e) {
         progressWatch_.disconnect();
-        std::cerr << "dovrel serve: a session failed: " << e.what() << std::endl;
+        std::cerr << "dovrel serve: a session failed: " << TerminalText(ErrorText(e)) << std::endl;
     }
     host_ = nullptr;
     ended_ = true;
@@ -200,8 +202,7 @@ void WebSession::send(const json& message) {
     link_->send(StateJson::Dump(message));
 }
 
-MsgAnswer WebSession::show(MsgIcon icon, MsgButtons buttons, const std::string& title,
-                           const std::string& text) {
+MsgAnswer WebSession::show(MsgIcon icon, MsgButtons buttons, const Utf8& title, const Utf8& text) {
     // The close button of an OK box is OK; a question's is No, the answer
     // that changes nothing.
     MsgAnswer closed = buttons == MsgButtons::Ok ? MsgAnswer::Ok : MsgAnswer::No;

@@ -60,8 +60,7 @@ public:
     bool ended() const { return ended_; }
     uint64_t id() const { return id_; }
 
-    MsgAnswer show(MsgIcon icon, MsgButtons buttons, const std::string& title,
-                   const std::string& text) override;
+    MsgAnswer show(MsgIcon icon, MsgButtons buttons, const Utf8& title, const Utf8& text) override;
     void ShowModal(Form& form) override;
 
     // The fewest milliseconds between two progress messages.

@@ -293,8 +293,9 @@ TEST_F(ViewerWindowTest, TheKeysStepSearchAndPressAndTheFocusShows) {
         EXPECT_EQ(ring->target(), focused);
         EXPECT_TRUE(ring->isVisible());
         for (QLineEdit* box : window->card().findChildren<QLineEdit*>()) {
-            if (box != focused)
+            if (box != focused) {
                 EXPECT_FALSE(box->hasSelectedText()) << box->objectName().toStdString();
+            }
         }
     }
 
@@ -338,8 +339,8 @@ TEST_F(ViewerWindowTest, TheStatusBarSaysWhatHappened) {
 
 TEST_F(ViewerWindowTest, MessageBoxesSpeakHebrew) {
     ASSERT_TRUE(QtTranslations::LoadHebrew(*QCoreApplication::instance()));
-    messages.show(MsgIcon::Question, MsgButtons::YesNo, "t", "q");
-    messages.show(MsgIcon::Information, MsgButtons::Ok, "t", "i");
+    messages.show(MsgIcon::Question, MsgButtons::YesNo, Utf8("t"), Utf8("q"));
+    messages.show(MsgIcon::Information, MsgButtons::Ok, Utf8("t"), Utf8("i"));
     std::sort(buttons.begin(), buttons.end());
     std::vector<QString> hebrew = {Q("כן"), Q("לא"), Q("אישור")};
     std::sort(hebrew.begin(), hebrew.end());
