@@ -1,19 +1,26 @@
 #include "app/qt/ViewerWindow.h"
 
+#include "app/export/DocumentExport.h"
 #include "app/qt/CardKeys.h"
 #include "app/qt/QtBrowser.h"
 #include "app/qt/QtText.h"
 #include "pictures/ItemPicsForm.h"
 #include "platform/Encoding.h"
+#include "platform/Error.h"
 #include "platform/SettingsStore.h"
 
 #include <QAction>
 #include <QCloseEvent>
 #include <QCoreApplication>
+#include <QDir>
+#include <QFileDialog>
 #include <QFileInfo>
 #include <QMenuBar>
 #include <QScrollArea>
 #include <QStatusBar>
+
+#include <filesystem>
+#include <fstream>
 
 namespace dovrel {
 
@@ -63,6 +70,8 @@ void ViewerWindow::buildMenus() {
             &QAction::triggered, this, [this] { keys_->press("CmdDir"); });
     connect(addAction(file, "הדפסה", QKeySequence(Qt::CTRL | Qt::Key_P)), &QAction::triggered, this,
             [this] { keys_->press("PrintButt"); });
+    connect(addAction(file, "ייצוא הסוג המוצג ל-CSV...", QKeySequence()), &QAction::triggered, this,
+            &ViewerWindow::chooseExportFile);
     file->addSeparator();
     connect(addAction(file, "יציאה", QKeySequence(Qt::CTRL | Qt::Key_Q)), &QAction::triggered, this,
             &QWidget::close);
@@ -125,6 +134,58 @@ void ViewerWindow::documentShown() {
 void ViewerWindow::databaseMissing(const std::string& database) {
     QString folder = QFileInfo(ToQString(database)).absolutePath();
     say(Q("קובץ ההגדרות לא נמצא בתיקייה %1").arg(folder));
+}
+
+void ViewerWindow::chooseExportFile() {
+    const auto& document = card_->card().document();
+    if (!document) {
+        say(Q("אין מסמך מוצג, ולכן אין סוג לייצוא"));
+        return;
+    }
+    QString suggested = QDir::home().filePath(QString("%1.csv").arg(document->type));
+    QString target =
+        QFileDialog::getSaveFileName(this, Q("ייצוא ל-CSV"), suggested, Q("CSV (*.csv)"));
+    if (!target.isEmpty())
+        exportShownType(target);
+}
+
+bool ViewerWindow::exportShownType(const QString& target) {
+    const auto& document = card_->card().document();
+    if (!document) {
+        say(Q("אין מסמך מוצג, ולכן אין סוג לייצוא"));
+        return false;
+    }
+    ExportOptions options;
+    options.types.set(document->type);
+    options.format = ExportOptions::Format::Csv;
+    Path company(std::filesystem::path(document->file.native()).parent_path().string());
+    // Written beside the target and moved over it only when complete, so a
+    // failed export never leaves half a file where the user looks for one.
+    QByteArray native = QFile::encodeName(target);
+    std::string partial = native.toStdString() + ".partial";
+    try {
+        ExportSummary summary;
+        {
+            std::ofstream out(partial, std::ios::binary | std::ios::trunc);
+            if (!out)
+                throw std::runtime_error("Cannot write " + partial);
+            summary = DocumentExport(options).run(company, out);
+            out.close();
+            if (!out)
+                throw std::runtime_error("Cannot write " + partial);
+        }
+        std::filesystem::rename(partial, native.toStdString());
+        QString text = Q("יוצאו %1 מסמכים אל %2").arg(summary.documents).arg(target);
+        if (summary.skippedCount > 0)
+            text += Q(" (%1 מסמכים פגומים דולגו)").arg(summary.skippedCount);
+        say(text);
+        return true;
+    } catch (const std::exception& failure) {
+        std::error_code ignored;
+        std::filesystem::remove(partial, ignored);
+        say(Q("הייצוא נכשל: %1").arg(ToQString(ErrorText(failure))));
+        return false;
+    }
 }
 
 void ViewerWindow::pageWritten(const QString& file) {

@@ -34,6 +34,9 @@ public:
     // order on unless the user's settings say otherwise, and puts the window
     // where it was last closed.
     void start();
+    // Writes every document of the shown document's type, of the shown
+    // company, as CSV to target; the status bar says how it went.
+    bool exportShownType(const QString& target);
 
     CardWidget& card() { return *card_; }
     CardKeys& keys() { return *keys_; }
@@ -51,6 +54,7 @@ private:
     void databaseMissing(const std::string& database);
     void pageWritten(const QString& file);
     void about();
+    void chooseExportFile();
     void say(const QString& text);
     void restorePlace();
     void savePlace();

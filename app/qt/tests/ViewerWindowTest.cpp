@@ -22,6 +22,8 @@
 #include <QAbstractButton>
 #include <QAction>
 #include <QApplication>
+#include <QFile>
+#include <QFileInfo>
 #include <QHeaderView>
 #include <QKeyEvent>
 #include <QLabel>
@@ -335,6 +337,24 @@ TEST_F(ViewerWindowTest, TheStatusBarSaysWhatHappened) {
     EXPECT_FALSE(pictures.CheckDBFile());
     EXPECT_TRUE(window->statusText().contains(Q(temp.str() + "/missing")))
         << window->statusText().toStdString();
+}
+
+TEST_F(ViewerWindowTest, ExportsTheShownTypeAsCsv) {
+    QString target = QString::fromStdString(temp.str() + "/20.csv");
+    EXPECT_FALSE(window->exportShownType(target));
+    EXPECT_FALSE(QFileInfo::exists(target));
+    showDemo();
+    ASSERT_TRUE(window->exportShownType(target)) << window->statusText().toStdString();
+    QFile file(target);
+    ASSERT_TRUE(file.open(QIODevice::ReadOnly));
+    QByteArray csv = file.readAll();
+    EXPECT_TRUE(csv.startsWith("\xEF\xBB\xBF"));
+    // The demo's delivery notes, counted in the status bar.
+    for (const char* reference : {"4101", "4105"})
+        EXPECT_TRUE(csv.contains(reference)) << reference;
+    EXPECT_TRUE(window->statusText().contains(Q("יוצאו 5 מסמכים")))
+        << window->statusText().toStdString();
+    EXPECT_FALSE(QFileInfo::exists(target + ".partial"));
 }
 
 TEST_F(ViewerWindowTest, MessageBoxesSpeakHebrew) {
