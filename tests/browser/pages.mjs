@@ -22,7 +22,11 @@ try {
 mkdirSync(outDir, { recursive: true });
 // The pages are printed with the control's default settings, not the user's.
 const env = { ...process.env, XDG_CONFIG_HOME: join(outDir, 'config') };
-const state = JSON.parse(execFileSync(dovrel, ['show', demo, '--json'], { encoding: 'utf8', env }));
+// The control's state after showing the first delivery note, from the
+// automation host (show --json gives the document, not the controls).
+const state = JSON.parse(execFileSync(dovrel, ['host'], {
+    encoding: 'utf8', env, input: JSON.stringify(['call', 'ShowDoc', demo, 20, 2]) + '\n',
+})).state;
 const page = (lang, name) => {
     const file = join(outDir, name);
     execFileSync(dovrel, ['print', demo, '--lang', String(lang), '--out', file, '--no-open',

@@ -30,7 +30,11 @@ writeFileSync(join(company, 'logo.png'), Buffer.from(
     'iVBORw0KGgoAAAANSUhEUgAAAAEAAAABCAYAAAAfFcSJAAAADUlEQVR42mP8z8DwHwAFBQIAX8jx0gAAAABJRU5ErkJggg==',
     'base64'));
 const env = { ...process.env, XDG_CONFIG_HOME: join(outDir, 'config') };
-const shown = JSON.parse(execFileSync(dovrel, ['show', company, '--json'], { encoding: 'utf8', env }));
+// The control's state after showing the first delivery note, from the
+// automation host (show --json gives the document, not the controls).
+const shown = JSON.parse(execFileSync(dovrel, ['host'], {
+    encoding: 'utf8', env, input: JSON.stringify(['call', 'ShowDoc', company, 20, 2]) + '\n',
+})).state;
 const firstCustomer = shown.controls.txtCustomerName;
 
 const failures = [];
